@@ -1,0 +1,14 @@
+#ifndef VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLEBILINEAR_H
+#define VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLEBILINEAR_H
+
+#include "vetra/base/utils/resample/engine/methods.h"
+#include "vetra/base/utils/resample/engine/sample.h"
+
+/// Bilinear sampling, over the 2 x 2 pixels from the floor of the position on.
+template <typename Tin, typename Tout>
+void ResampleBilinear(const vetra::utils::engine::SamplingArguments<Tin, Tout>& oArgs,
+                      vetra::utils::NodataFillAction eFillAction) {
+    vetra::utils::engine::Sample(oArgs, vetra::utils::engine::kBilinearMethod, eFillAction);
+}
+
+#endif  // VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLEBILINEAR_H

@@ -1,0 +1,522 @@
+// The sampling loop.
+//
+// Each thread of the team takes a contiguous share of the flat target index and walks it in spans
+// of up to kSpanPixels pixels. A span goes through the stages positions, modes, places, values,
+// store; its arrays stay in the first-level cache. Types matter at the ends only, where samples are
+// read and stored: the stages come from tables with an entry per type.
+//
+// Two walks make the spans. The general one evaluates positions and modes for every pixel, and
+// stays one span ahead of the values stage, so that the source samples are on their way to the
+// cache when they are needed. The axis-aligned one reads columns from tables that are made once per
+// run, and rows once per target row.
+
+#include <omp.h>
+
+#include <algorithm>
+#include <cmath>
+#include <cstddef>
+#include <cstdint>
+#include <cstring>
+#include <vector>
+
+#include "vetra/base/utils/resample/engine/positions.h"
+#include "vetra/base/utils/resample/engine/task.h"
+
+namespace vetra::utils::engine {
+
+namespace {
+
+constexpr int kSpanArray = kSpanPixels + kLanes;
+constexpr int kSampleBytes[kNumSampleTypes] = {1, 1, 2, 2, 4, 4, 4, 8, 8, 8};
+
+// Sets of modes.
+constexpr unsigned kSetBackground = 1u << ePO_BACKGROUND;
+constexpr unsigned kSetInterpolated = 1u << ePO_INTERPOLATED;
+constexpr unsigned kSetNearest = 1u << ePO_NEAREST;
+constexpr unsigned kSetUntouched = 1u << ePO_UNTOUCHED;
+
+// A span after the places stage.
+struct Span {
+    long long nFirst = 0;
+    int nPix = 0;
+    const unsigned char* pabyMode = nullptr;
+    unsigned nModes = 0;
+    // Offsets count from these samples.
+    const char* pWindowSrc = nullptr;
+    const char* pNearestSrc = nullptr;
+    const std::int64_t* panWindow = nullptr;
+    const std::int64_t* panNearest = nullptr;
+    const double* padfFracCol = nullptr;
+    const double* padfFracRow = nullptr;
+    bool bOneRow = false;
+
+    const unsigned char* ModesUnless(unsigned nSet) const {
+        return nModes == nSet ? nullptr : pabyMode;
+    }
+};
+
+// A span with arrays of its own.
+struct SpanArrays {
+    Span oSpan;
+    alignas(64) double adfCol[kSpanArray] = {};
+    alignas(64) double adfRow[kSpanArray] = {};
+    alignas(64) double adfFracCol[kSpanArray] = {};
+    alignas(64) double adfFracRow[kSpanArray] = {};
+    alignas(64) std::int64_t anWindow[kSpanArray] = {};
+    alignas(64) std::int64_t anNearest[kSpanArray] = {};
+    alignas(64) unsigned char abyMode[kSpanArray] = {};
+};
+
+// Values of one channel of a span, and the samples they become.
+struct ValueArrays {
+    alignas(64) double adfValue[kSpanArray] = {};
+    alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
+};
+
+unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
+    // Mostly they are all the same: every byte equals the one behind it.
+    if (std::memcmp(pabyMode, pabyMode + 1, static_cast<std::size_t>(nPix) - 1) == 0) {
+        return 1u << pabyMode[0];
+    }
+    unsigned nModes = 0;
+    for (int i = 0; i < nPix; ++i) {
+        nModes |= 1u << pabyMode[i];
+    }
+    return nModes;
+}
+
+// What an axis-aligned run tabulates per target column. Places of columns outside have offset 0.
+struct ColumnTables {
+    std::vector<double> vdfPosition;
+    std::vector<double> vdfFrac;
+    std::vector<std::int64_t> vnWindow;
+    std::vector<std::int64_t> vnNearest;
+    std::vector<unsigned char> vbyClass;
+    // Modes by the class of the row, where no mask has a say.
+    std::vector<unsigned char> avbyMode[4];
+};
+
+class Run {
+ public:
+    explicit Run(const Task& oTask);
+
+    // Fills target pixels nBegin to nEnd - 1.
+    void Walk(long long nBegin, long long nEnd) const {
+        moColumns.vdfPosition.empty() ? WalkGeneral(nBegin, nEnd) : WalkRows(nBegin, nEnd);
+    }
+
+ private:
+    void MakeColumnTables();
+    unsigned char OpenMode(unsigned char nClass) const;
+
+    void WalkGeneral(long long nBegin, long long nEnd) const;
+    void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
+    // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
+    [[gnu::always_inline]] inline void Prefetch(const Span& oSpan) const;
+
+    void WalkRows(long long nBegin, long long nEnd) const;
+    void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+                 ValueArrays& oValues) const;
+
+    void ChooseModes(long long nFirst, int nPix, const double* padfCol, const double* padfRow,
+                     int nRowStep, unsigned char* pabyClassThenMode) const;
+
+    void Finish(const Span& oSpan, ValueArrays& oValues) const;
+    void CopyRuns(const Span& oSpan) const;
+    void FillBackground(long long nFirst, int nPix) const;
+    template <typename Bits>
+    void Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const;
+
+    const char* SrcSample(long long nRow, int nCol) const {
+        return static_cast<const char*>(moTask.pSrc) +
+               (nRow * mnPitch + static_cast<long long>(nCol) * moTask.nChan) * mnSrcBytes;
+    }
+    char* TgtPixel(long long nPixel) const {
+        return static_cast<char*>(moTask.pTgt) + nPixel * moTask.nChan * mnTgtBytes;
+    }
+
+    const Task& moTask;
+    const Method& moMethod;
+    const LevelStages& moStages;
+    Positions moPositions;
+    ModeChooser moChooser;
+    ClassLimits moLimits;
+    // Neither mask has a say: modes follow from positions alone.
+    bool mbOpen;
+    // The mode of a pixel whose window doesn't fit but whose nearest pixel is there.
+    unsigned char mnFallback;
+    long long mnPitch;
+    int mnSrcBytes;
+    int mnTgtBytes;
+    // Samples go from source to target as they are; null where they pass through a double.
+    CopyFunction mpfnCopy = nullptr;
+    ColumnTables moColumns;
+};
+
+Run::Run(const Task& oTask)
+    : moTask(oTask),
+      moMethod(*oTask.poMethod),
+      moStages(GetStages(oTask.oOptions.eLevel)),
+      moPositions(*oTask.poTfm),
+      moChooser(moMethod.eRule, moMethod.oWindow, oTask.pabySrcMask, oTask.nSrcCols, oTask.nSrcRows,
+                oTask.eFillAction),
+      mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
+      mnPitch(static_cast<long long>(oTask.nSrcCols) * oTask.nChan),
+      mnSrcBytes(kSampleBytes[oTask.nSrcType]),
+      mnTgtBytes(kSampleBytes[oTask.nTgtType]) {
+    const Window& oWindow = moMethod.oWindow;
+    moLimits.dfFitColFirst = -static_cast<double>(oWindow.nColOff);
+    moLimits.dfFitRowFirst = -static_cast<double>(oWindow.nRowOff);
+    moLimits.dfFitColLast = static_cast<double>(oTask.nSrcCols) - oWindow.nCols - oWindow.nColOff;
+    moLimits.dfFitRowLast = static_cast<double>(oTask.nSrcRows) - oWindow.nRows - oWindow.nRowOff;
+    moLimits.dfNearColLast = oTask.nSrcCols - 1.0;
+    moLimits.dfNearRowLast = oTask.nSrcRows - 1.0;
+    moLimits.bAnchorNearest = oWindow.bAnchorNearest;
+
+    const bool bNearest = moMethod.eRule == ModeRule::eNearestSample;
+    mnFallback = bNearest || oTask.eFillAction != eNFA_BGD ? ePO_NEAREST : ePO_BACKGROUND;
+    if (oTask.oOptions.bShortcuts) {
+        if (bNearest && oTask.nSrcType == oTask.nTgtType) {
+            mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
+        }
+        if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
+            MakeColumnTables();
+        }
+    }
+}
+
+// The mode of a pixel of this class where no mask has a say.
+unsigned char Run::OpenMode(unsigned char nClass) const {
+    if (moMethod.papfnValues != nullptr && (nClass & kClassFits) != 0) {
+        return ePO_INTERPOLATED;
+    }
+    return (nClass & kClassNear) != 0 ? mnFallback : static_cast<unsigned char>(ePO_BACKGROUND);
+}
+
+void Run::MakeColumnTables() {
+    const int nCols = moTask.nTgtCols;
+    const std::size_t nSize = static_cast<std::size_t>(nCols) + kSpanArray;
+    moColumns.vdfPosition.resize(nSize);
+    moColumns.vdfFrac.resize(nSize);
+    moColumns.vnWindow.resize(nSize);
+    moColumns.vnNearest.resize(nSize);
+    moColumns.vbyClass.resize(nSize);
+    std::vector<double> vdfRow(kSpanArray);
+    for (int nX = 0; nX < nCols; nX += kSpanPixels) {
+        const int nPix = std::min(kSpanPixels, nCols - nX);
+        double* padfCol = moColumns.vdfPosition.data() + nX;
+        moPositions.Fill(moStages, nX, nPix, padfCol, vdfRow.data());
+        // Any row inside will do: only the column's part of the class and the places are kept.
+        std::fill(vdfRow.begin(), vdfRow.end(), 0.0);
+        ClassLimits oColumnLimits = moLimits;
+        oColumnLimits.dfFitRowFirst = 0.0;
+        oColumnLimits.dfFitRowLast = 0.0;
+        unsigned char* pabyClass = moColumns.vbyClass.data() + nX;
+        moStages.pfnClasses(oColumnLimits, padfCol, vdfRow.data(), nPix, pabyClass);
+        unsigned char abyMode[kSpanArray] = {};
+        for (int i = 0; i < nPix; ++i) {
+            abyMode[i] = (pabyClass[i] & kClassFits) != 0 ? ePO_INTERPOLATED : ePO_BACKGROUND;
+        }
+        double adfUnused[kSpanArray];
+        moStages.pfnWindows(moLimits.bAnchorNearest, moMethod.oWindow.nColOff, 0.0, 0.0,
+                            moTask.nChan, padfCol, vdfRow.data(), abyMode, nPix,
+                            moColumns.vnWindow.data() + nX, moColumns.vdfFrac.data() + nX,
+                            adfUnused);
+        for (int i = 0; i < nPix; ++i) {
+            abyMode[i] = (pabyClass[i] & kClassNear) != 0 ? ePO_NEAREST : ePO_BACKGROUND;
+        }
+        moStages.pfnNearestPlaces(0.0, moTask.nChan, padfCol, vdfRow.data(), abyMode, nPix,
+                                  moColumns.vnNearest.data() + nX);
+    }
+    // The entries behind the last column belong to no pixel; groups that reach into them stay in
+    // the source.
+    for (std::size_t i = static_cast<std::size_t>(nCols); i < nSize; ++i) {
+        moColumns.vnWindow[i] = 0;
+        moColumns.vnNearest[i] = 0;
+        moColumns.vbyClass[i] = 0;
+    }
+    for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
+        auto& vbyMode = moColumns.avbyMode[nRowClass];
+        vbyMode.resize(nSize);
+        for (std::size_t i = 0; i < nSize; ++i) {
+            vbyMode[i] = OpenMode(moColumns.vbyClass[i] & nRowClass);
+        }
+    }
+}
+
+void Run::WalkGeneral(long long nBegin, long long nEnd) const {
+    SpanArrays oArrays;
+    ValueArrays oValues;
+    for (long long nFirst = nBegin; nFirst < nEnd; nFirst += kSpanPixels) {
+        Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)), oArrays);
+        Finish(oArrays.oSpan, oValues);
+    }
+}
+
+void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
+    Span& oSpan = oArrays.oSpan;
+    oSpan.nFirst = nFirst;
+    oSpan.nPix = nPix;
+    oSpan.pabyMode = oArrays.abyMode;
+    oSpan.pWindowSrc = static_cast<const char*>(moTask.pSrc);
+    oSpan.pNearestSrc = oSpan.pWindowSrc;
+    oSpan.panWindow = oArrays.anWindow;
+    oSpan.panNearest = oArrays.anNearest;
+    oSpan.padfFracCol = oArrays.adfFracCol;
+    oSpan.padfFracRow = oArrays.adfFracRow;
+
+    moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
+    if (mbOpen) {
+        oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.papfnValues != nullptr, mnFallback,
+                                             oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
+    } else {
+        moStages.pfnClasses(moLimits, oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
+        ChooseModes(nFirst, nPix, oArrays.adfCol, oArrays.adfRow, 1, oArrays.abyMode);
+        oSpan.nModes = SetOfModes(oArrays.abyMode, nPix);
+    }
+    if ((oSpan.nModes & kSetInterpolated) != 0) {
+        moStages.pfnWindows(moLimits.bAnchorNearest, moMethod.oWindow.nColOff,
+                            moMethod.oWindow.nRowOff, static_cast<double>(mnPitch), moTask.nChan,
+                            oArrays.adfCol, oArrays.adfRow, oSpan.ModesUnless(kSetInterpolated),
+                            nPix, oArrays.anWindow, oArrays.adfFracCol, oArrays.adfFracRow);
+    }
+    if ((oSpan.nModes & kSetNearest) != 0) {
+        moStages.pfnNearestPlaces(static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
+                                  oArrays.adfRow, oSpan.ModesUnless(kSetNearest), nPix,
+                                  oArrays.anNearest);
+    }
+    Prefetch(oSpan);
+}
+
+// Asks for the source rows that the next target rows will need. A target row crosses many source
+// rows at a slant, a few pixels each, which no prefetcher of the processor foresees; each target
+// row reaches a little further up or down than the one before.
+void Run::Prefetch(const Span& oSpan) const {
+    constexpr int kStep = 8;
+    constexpr int kRowsAhead = 4;
+    const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
+    if (!bWindows && (oSpan.nModes & kSetNearest) == 0) {
+        return;
+    }
+    const std::int64_t* panOffset = bWindows ? oSpan.panWindow : oSpan.panNearest;
+    // Integers, since the addresses may lie outside the source; a prefetch of those does nothing.
+    const auto nSrc = reinterpret_cast<std::uintptr_t>(moTask.pSrc);
+    const auto nRowBytes = static_cast<std::uintptr_t>(mnPitch * mnSrcBytes);
+    const std::uintptr_t nAbove = nSrc - kRowsAhead * nRowBytes;
+    const std::uintptr_t nBelow =
+        nSrc + static_cast<std::uintptr_t>(moMethod.oWindow.nRows - 1 + kRowsAhead) * nRowBytes;
+    for (int i = 0; i < oSpan.nPix; i += kStep) {
+        const auto nOffset = static_cast<std::uintptr_t>(panOffset[i] * mnSrcBytes);
+        __builtin_prefetch(reinterpret_cast<const void*>(nAbove + nOffset));
+        __builtin_prefetch(reinterpret_cast<const void*>(nBelow + nOffset));
+    }
+}
+
+// Turns classes into modes. nRowStep is 0 where all pixels share the first row position.
+void Run::ChooseModes(long long nFirst, int nPix, const double* padfCol, const double* padfRow,
+                      int nRowStep, unsigned char* pabyClassThenMode) const {
+    const unsigned char* pabyRequest =
+        moTask.pabyTgtMask == nullptr ? nullptr : moTask.pabyTgtMask + nFirst;
+    for (int i = 0; i < nPix; ++i) {
+        const unsigned char nRequest =
+            pabyRequest == nullptr ? static_cast<unsigned char>(1) : pabyRequest[i];
+        pabyClassThenMode[i] =
+            moChooser.Choose(nRequest, pabyClassThenMode[i], padfCol[i], padfRow[i * nRowStep]);
+    }
+    // The group of the last pixel holds classes of pixels that don't exist.
+    for (int i = nPix; i % kLanes != 0; ++i) {
+        pabyClassThenMode[i] = pabyClassThenMode[nPix - 1];
+    }
+}
+
+void Run::WalkRows(long long nBegin, long long nEnd) const {
+    ValueArrays oValues;
+    const int nCols = moTask.nTgtCols;
+    for (long long nFirst = nBegin; nFirst < nEnd;) {
+        const int nFirstCol = static_cast<int>(nFirst % nCols);
+        const int nNumCols =
+            static_cast<int>(std::min<long long>(nCols - nFirstCol, nEnd - nFirst));
+        double dfCol = 0.0;
+        double dfRow = 0.0;
+        moTask.poTfm->GetSrcPos(nFirst, dfCol, dfRow);
+        FillRow(dfRow, nFirst, nFirstCol, nNumCols, oValues);
+        nFirst += nNumCols;
+    }
+}
+
+// Fills a stretch of one target row.
+void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+                  ValueArrays& oValues) const {
+    const double dfNearRow = std::floor(dfRow + 0.5);
+    const double dfAnchorRow = moLimits.bAnchorNearest ? dfNearRow : std::floor(dfRow);
+    const double dfFracRow = dfRow - dfAnchorRow;
+    const bool bFits =
+        dfAnchorRow >= moLimits.dfFitRowFirst && dfAnchorRow <= moLimits.dfFitRowLast;
+    const bool bNear = dfNearRow >= 0.0 && dfNearRow <= moLimits.dfNearRowLast;
+    const auto nRowClass =
+        static_cast<unsigned char>((bFits ? kClassFits : 0) | (bNear ? kClassNear : 0));
+
+    Span oSpan;
+    oSpan.bOneRow = true;
+    oSpan.padfFracRow = &dfFracRow;
+    // Rows outside have no samples: no pixel of theirs has a mode that reads any.
+    oSpan.pWindowSrc =
+        bFits ? SrcSample(static_cast<long long>(dfAnchorRow) + moMethod.oWindow.nRowOff, 0)
+              : nullptr;
+    oSpan.pNearestSrc = bNear ? SrcSample(static_cast<long long>(dfNearRow), 0) : nullptr;
+    alignas(64) unsigned char abyMode[kSpanArray];
+    for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
+        const std::size_t nCol = static_cast<std::size_t>(nFirstCol) + nDone;
+        oSpan.nFirst = nFirst + nDone;
+        oSpan.nPix = std::min(kSpanPixels, nNumCols - nDone);
+        oSpan.padfFracCol = moColumns.vdfFrac.data() + nCol;
+        oSpan.panWindow = moColumns.vnWindow.data() + nCol;
+        oSpan.panNearest = moColumns.vnNearest.data() + nCol;
+        if (mbOpen) {
+            oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
+        } else {
+            for (int i = 0; i < oSpan.nPix; ++i) {
+                abyMode[i] = moColumns.vbyClass[nCol + i] & nRowClass;
+            }
+            ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vdfPosition.data() + nCol, &dfRow, 0,
+                        abyMode);
+            oSpan.pabyMode = abyMode;
+        }
+        oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
+        Finish(oSpan, oValues);
+    }
+}
+
+// The last stages: values and store.
+void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
+    if (moTask.oOptions.pabyOutcome != nullptr) {
+        std::memcpy(moTask.oOptions.pabyOutcome + oSpan.nFirst, oSpan.pabyMode,
+                    static_cast<std::size_t>(oSpan.nPix));
+    }
+    if (oSpan.nModes == kSetUntouched) {
+        return;
+    }
+    if (oSpan.nModes == kSetBackground) {
+        FillBackground(oSpan.nFirst, oSpan.nPix);
+        return;
+    }
+    if (mpfnCopy != nullptr) {
+        CopyRuns(oSpan);
+        return;
+    }
+    const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
+    const bool bNearest = (oSpan.nModes & kSetNearest) != 0;
+    const WindowSpan oWindows{
+        oSpan.panWindow, oSpan.padfFracCol, oSpan.padfFracRow, oSpan.ModesUnless(kSetInterpolated),
+        oSpan.nPix,      mnPitch,           moTask.nChan,      oSpan.bOneRow};
+    for (int nChannel = 0; nChannel < moTask.nChan; ++nChannel) {
+        const std::ptrdiff_t nShift = static_cast<std::ptrdiff_t>(nChannel) * mnSrcBytes;
+        if (bWindows) {
+            (moStages.*moMethod.papfnValues)[moTask.nSrcType](oWindows, oSpan.pWindowSrc + nShift,
+                                                              moTask.pParameters, oValues.adfValue);
+        }
+        if (bNearest) {
+            moStages.apfnNearest[moTask.nSrcType](oSpan.pNearestSrc + nShift, oSpan.panNearest,
+                                                  oSpan.ModesUnless(kSetNearest), oSpan.nPix,
+                                                  oValues.adfValue);
+        }
+        moStages.apfnStore[moTask.nTgtType](oValues.adfValue, oSpan.nPix, moTask.pLimits,
+                                            oValues.abySample);
+        switch (mnTgtBytes) {
+            case 1:
+                Deliver<std::uint8_t>(oSpan, nChannel, oValues.abySample);
+                break;
+            case 2:
+                Deliver<std::uint16_t>(oSpan, nChannel, oValues.abySample);
+                break;
+            case 4:
+                Deliver<std::uint32_t>(oSpan, nChannel, oValues.abySample);
+                break;
+            default:
+                Deliver<std::uint64_t>(oSpan, nChannel, oValues.abySample);
+                break;
+        }
+    }
+}
+
+// Writes one channel of a span: samples, background, or nothing, as each pixel's mode says.
+template <typename Bits>
+void Run::Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const {
+    const int nChan = moTask.nChan;
+    char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::ptrdiff_t>(nChannel) * sizeof(Bits);
+    const auto fnWrite = [&](int i, const void* pSample) {
+        std::memcpy(pTgt + static_cast<std::ptrdiff_t>(i) * nChan * sizeof(Bits), pSample,
+                    sizeof(Bits));
+    };
+    const auto fnSample = [&](int i) { return pabySample + i * sizeof(Bits); };
+    if ((oSpan.nModes & (kSetBackground | kSetUntouched)) == 0) {
+        if (nChan == 1) {
+            std::memcpy(pTgt, pabySample, oSpan.nPix * sizeof(Bits));
+            return;
+        }
+        for (int i = 0; i < oSpan.nPix; ++i) {
+            fnWrite(i, fnSample(i));
+        }
+        return;
+    }
+    for (int i = 0; i < oSpan.nPix; ++i) {
+        if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
+            fnWrite(i, oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground : fnSample(i));
+        }
+    }
+}
+
+// Nearest sampling without a change of type: whole pixels, clamped where they arrive.
+void Run::CopyRuns(const Span& oSpan) const {
+    const int nChan = moTask.nChan;
+    for (int nBegin = 0; nBegin < oSpan.nPix;) {
+        const unsigned char nMode = oSpan.pabyMode[nBegin];
+        int nEnd = oSpan.nPix;
+        if (oSpan.nModes != kSetNearest) {
+            nEnd = nBegin + 1;
+            while (nEnd < oSpan.nPix && oSpan.pabyMode[nEnd] == nMode) {
+                ++nEnd;
+            }
+        }
+        if (nMode == ePO_NEAREST) {
+            char* pTgt = TgtPixel(oSpan.nFirst + nBegin);
+            mpfnCopy(oSpan.pNearestSrc, oSpan.panNearest + nBegin, nEnd - nBegin, nChan, pTgt);
+            if (!moTask.bClampIsOpen) {
+                moStages.apfnClamp[moTask.nTgtType](
+                    pTgt, static_cast<std::int64_t>(nEnd - nBegin) * nChan, moTask.pLimits);
+            }
+        } else if (nMode == ePO_BACKGROUND) {
+            FillBackground(oSpan.nFirst + nBegin, nEnd - nBegin);
+        }
+        nBegin = nEnd;
+    }
+}
+
+void Run::FillBackground(long long nFirst, int nPix) const {
+    char* pTgt = TgtPixel(nFirst);
+    const long long nBytes = static_cast<long long>(nPix) * moTask.nChan * mnTgtBytes;
+    for (long long i = 0; i < nBytes; i += mnTgtBytes) {
+        std::memcpy(pTgt + i, moTask.pBackground, static_cast<std::size_t>(mnTgtBytes));
+    }
+}
+
+}  // namespace
+
+void Execute(const Task& oTask) {
+    const Run oRun(oTask);
+    const long long nNumPix = static_cast<long long>(oTask.nTgtCols) * oTask.nTgtRows;
+#pragma omp parallel
+    {
+        const long long nThreads = omp_get_num_threads();
+        const long long nThread = omp_get_thread_num();
+        const long long nShare = nNumPix / nThreads;
+        const long long nRest = nNumPix % nThreads;
+        const long long nBegin = nThread * nShare + std::min(nThread, nRest);
+        const long long nEnd = nBegin + nShare + (nThread < nRest ? 1 : 0);
+        if (nBegin < nEnd) {
+            oRun.Walk(nBegin, nEnd);
+        }
+    }
+}
+
+}  // namespace vetra::utils::engine

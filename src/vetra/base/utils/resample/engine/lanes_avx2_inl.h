@@ -1,0 +1,111 @@
+// The lane layer for AVX2: two registers of four doubles. Included inside a level's namespace; see
+// stages_inl.h for what a lane layer offers.
+
+struct F64 {
+    __m256d lo;
+    __m256d hi;
+};
+struct B64 {
+    __m256d lo;
+    __m256d hi;
+};
+
+inline F64 operator+(F64 a, F64 b) {
+    return {_mm256_add_pd(a.lo, b.lo), _mm256_add_pd(a.hi, b.hi)};
+}
+inline F64 operator-(F64 a, F64 b) {
+    return {_mm256_sub_pd(a.lo, b.lo), _mm256_sub_pd(a.hi, b.hi)};
+}
+inline F64 operator*(F64 a, F64 b) {
+    return {_mm256_mul_pd(a.lo, b.lo), _mm256_mul_pd(a.hi, b.hi)};
+}
+inline F64 operator/(F64 a, F64 b) {
+    return {_mm256_div_pd(a.lo, b.lo), _mm256_div_pd(a.hi, b.hi)};
+}
+inline B64 operator<=(F64 a, F64 b) {
+    return {_mm256_cmp_pd(a.lo, b.lo, _CMP_LE_OQ), _mm256_cmp_pd(a.hi, b.hi, _CMP_LE_OQ)};
+}
+inline B64 operator<(F64 a, F64 b) {
+    return {_mm256_cmp_pd(a.lo, b.lo, _CMP_LT_OQ), _mm256_cmp_pd(a.hi, b.hi, _CMP_LT_OQ)};
+}
+inline B64 operator>(F64 a, F64 b) { return b < a; }
+inline B64 operator==(F64 a, F64 b) {
+    return {_mm256_cmp_pd(a.lo, b.lo, _CMP_EQ_OQ), _mm256_cmp_pd(a.hi, b.hi, _CMP_EQ_OQ)};
+}
+inline B64 operator&(B64 a, B64 b) {
+    return {_mm256_and_pd(a.lo, b.lo), _mm256_and_pd(a.hi, b.hi)};
+}
+inline F64 Select(B64 m, F64 a, F64 b) {
+    return {_mm256_blendv_pd(b.lo, a.lo, m.lo), _mm256_blendv_pd(b.hi, a.hi, m.hi)};
+}
+
+inline F64 Set1(double df) { return {_mm256_set1_pd(df), _mm256_set1_pd(df)}; }
+inline F64 Load(const double* p) { return {_mm256_loadu_pd(p), _mm256_loadu_pd(p + 4)}; }
+inline void Store(double* p, F64 a) {
+    _mm256_storeu_pd(p, a.lo);
+    _mm256_storeu_pd(p + 4, a.hi);
+}
+
+inline F64 Floor(F64 a) { return {_mm256_floor_pd(a.lo), _mm256_floor_pd(a.hi)}; }
+inline F64 RoundEven(F64 a) {
+    constexpr int nMode = _MM_FROUND_TO_NEAREST_INT | _MM_FROUND_NO_EXC;
+    return {_mm256_round_pd(a.lo, nMode), _mm256_round_pd(a.hi, nMode)};
+}
+inline F64 Abs(F64 a) {
+    const __m256d vSign = _mm256_set1_pd(-0.0);
+    return {_mm256_andnot_pd(vSign, a.lo), _mm256_andnot_pd(vSign, a.hi)};
+}
+
+inline unsigned Bits(B64 b) {
+    return static_cast<unsigned>(_mm256_movemask_pd(b.lo) | _mm256_movemask_pd(b.hi) << 4);
+}
+inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
+    const __m128i v = _mm_cmpeq_epi8(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
+                                     _mm_set1_epi8(static_cast<char>(nValue)));
+    return {_mm256_castsi256_pd(_mm256_cvtepi8_epi64(v)),
+            _mm256_castsi256_pd(_mm256_cvtepi8_epi64(_mm_srli_si128(v, 4)))};
+}
+
+inline F64 FromInt32(__m256i v) {
+    return {_mm256_cvtepi32_pd(_mm256_castsi256_si128(v)),
+            _mm256_cvtepi32_pd(_mm256_extracti128_si256(v, 1))};
+}
+inline F64 FromFloat(__m256 v) {
+    return {_mm256_cvtps_pd(_mm256_castps256_ps128(v)),
+            _mm256_cvtps_pd(_mm256_extractf128_ps(v, 1))};
+}
+inline F64 FromHalves(__m256d lo, __m256d hi) { return {lo, hi}; }
+inline __m256i ToInt32(F64 a) {
+    return _mm256_set_m128i(_mm256_cvttpd_epi32(a.hi), _mm256_cvttpd_epi32(a.lo));
+}
+inline __m256 ToFloat(F64 a) {
+    return _mm256_set_m128(_mm256_cvtpd_ps(a.hi), _mm256_cvtpd_ps(a.lo));
+}
+
+// Eight 32-bit integers that fit as 16-bit ones, or as 8-bit ones in the low half.
+template <bool kSigned>
+inline __m128i Narrow16(__m256i v) {
+    const __m128i vLow = _mm256_castsi256_si128(v);
+    const __m128i vHigh = _mm256_extracti128_si256(v, 1);
+    return kSigned ? _mm_packs_epi32(vLow, vHigh) : _mm_packus_epi32(vLow, vHigh);
+}
+template <bool kSigned>
+inline __m128i Narrow8(__m256i v) {
+    const __m128i v16 = Narrow16<true>(v);
+    return kSigned ? _mm_packs_epi16(v16, v16) : _mm_packus_epi16(v16, v16);
+}
+
+inline F64 LoadFloats(const float* p) { return FromFloat(_mm256_loadu_ps(p)); }
+
+// Adding 2^52 leaves a whole number from 0 to 2^52 - 1 in the low bits of the mantissa.
+inline void StoreIntegers(std::int64_t* p, F64 a) {
+    const __m256d vMagic = _mm256_set1_pd(0x1p52);
+    const auto fnStore = [&](std::int64_t* q, __m256d v) {
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(q),
+                            _mm256_castpd_si256(_mm256_xor_pd(_mm256_add_pd(v, vMagic), vMagic)));
+    };
+    fnStore(p, a.lo);
+    fnStore(p + 4, a.hi);
+}
+
+#include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"

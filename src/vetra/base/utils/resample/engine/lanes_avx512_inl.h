@@ -1,0 +1,64 @@
+// The lane layer for AVX-512: one register of eight doubles. Included inside a level's namespace;
+// see stages_inl.h for what a lane layer offers.
+
+struct F64 {
+    __m512d v;
+};
+struct B64 {
+    __mmask8 m;
+};
+
+inline F64 operator+(F64 a, F64 b) { return {_mm512_add_pd(a.v, b.v)}; }
+inline F64 operator-(F64 a, F64 b) { return {_mm512_sub_pd(a.v, b.v)}; }
+inline F64 operator*(F64 a, F64 b) { return {_mm512_mul_pd(a.v, b.v)}; }
+inline F64 operator/(F64 a, F64 b) { return {_mm512_div_pd(a.v, b.v)}; }
+inline B64 operator<=(F64 a, F64 b) { return {_mm512_cmp_pd_mask(a.v, b.v, _CMP_LE_OQ)}; }
+inline B64 operator<(F64 a, F64 b) { return {_mm512_cmp_pd_mask(a.v, b.v, _CMP_LT_OQ)}; }
+inline B64 operator>(F64 a, F64 b) { return b < a; }
+inline B64 operator==(F64 a, F64 b) { return {_mm512_cmp_pd_mask(a.v, b.v, _CMP_EQ_OQ)}; }
+inline B64 operator&(B64 a, B64 b) { return {static_cast<__mmask8>(a.m & b.m)}; }
+inline F64 Select(B64 m, F64 a, F64 b) { return {_mm512_mask_blend_pd(m.m, b.v, a.v)}; }
+
+inline F64 Set1(double df) { return {_mm512_set1_pd(df)}; }
+inline F64 Load(const double* p) { return {_mm512_loadu_pd(p)}; }
+inline void Store(double* p, F64 a) { _mm512_storeu_pd(p, a.v); }
+
+inline F64 Floor(F64 a) {
+    return {_mm512_roundscale_pd(a.v, _MM_FROUND_TO_NEG_INF | _MM_FROUND_NO_EXC)};
+}
+inline F64 RoundEven(F64 a) {
+    return {_mm512_roundscale_pd(a.v, _MM_FROUND_TO_NEAREST_INT | _MM_FROUND_NO_EXC)};
+}
+inline F64 Abs(F64 a) { return {_mm512_andnot_pd(_mm512_set1_pd(-0.0), a.v)}; }
+
+inline unsigned Bits(B64 b) { return b.m; }
+inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
+    const __mmask16 m = _mm_cmpeq_epi8_mask(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
+                                            _mm_set1_epi8(static_cast<char>(nValue)));
+    return {static_cast<__mmask8>(m)};
+}
+
+inline F64 FromInt32(__m256i v) { return {_mm512_cvtepi32_pd(v)}; }
+inline F64 FromFloat(__m256 v) { return {_mm512_cvtps_pd(v)}; }
+inline F64 FromHalves(__m256d lo, __m256d hi) {
+    return {_mm512_insertf64x4(_mm512_castpd256_pd512(lo), hi, 1)};
+}
+inline __m256i ToInt32(F64 a) { return _mm512_cvttpd_epi32(a.v); }
+inline __m256 ToFloat(F64 a) { return _mm512_cvtpd_ps(a.v); }
+
+// Eight 32-bit integers that fit as 16-bit ones, or as 8-bit ones in the low half.
+template <bool kSigned>
+inline __m128i Narrow16(__m256i v) {
+    return _mm256_cvtepi32_epi16(v);
+}
+template <bool kSigned>
+inline __m128i Narrow8(__m256i v) {
+    return _mm256_cvtepi32_epi8(v);
+}
+
+inline F64 LoadFloats(const float* p) { return FromFloat(_mm256_loadu_ps(p)); }
+inline void StoreIntegers(std::int64_t* p, F64 a) {
+    _mm512_storeu_si512(p, _mm512_cvttpd_epi64(a.v));
+}
+
+#include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"

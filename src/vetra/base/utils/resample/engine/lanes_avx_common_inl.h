@@ -1,0 +1,210 @@
+// What the AVX2 and AVX-512 lane layers share: the bits of eight samples, picked up one by one. No
+// load reaches beyond the samples that it is asked for, so none leaves the source. Included inside
+// a level's namespace.
+
+template <typename U, typename T>
+inline U LoadBits(const T* p) {
+    U n;
+    __builtin_memcpy(&n, p, sizeof n);
+    return n;
+}
+
+// Eight 8-bit values in the low half.
+inline __m128i Gather8(const void* p, const std::int64_t* o) {
+    const char* q = static_cast<const char*>(p);
+    __m128i v = _mm_cvtsi32_si128(static_cast<unsigned char>(q[o[0]]));
+    v = _mm_insert_epi8(v, q[o[1]], 1);
+    v = _mm_insert_epi8(v, q[o[2]], 2);
+    v = _mm_insert_epi8(v, q[o[3]], 3);
+    v = _mm_insert_epi8(v, q[o[4]], 4);
+    v = _mm_insert_epi8(v, q[o[5]], 5);
+    v = _mm_insert_epi8(v, q[o[6]], 6);
+    return _mm_insert_epi8(v, q[o[7]], 7);
+}
+
+// Eight 16-bit values, each at nScale * offset bytes.
+template <int nScale>
+inline __m128i Gather16(const void* p, const std::int64_t* o) {
+    const char* q = static_cast<const char*>(p);
+    const auto fnLoad = [&](int i) { return LoadBits<short>(q + nScale * o[i]); };
+    __m128i v = _mm_cvtsi32_si128(static_cast<unsigned short>(fnLoad(0)));
+    v = _mm_insert_epi16(v, fnLoad(1), 1);
+    v = _mm_insert_epi16(v, fnLoad(2), 2);
+    v = _mm_insert_epi16(v, fnLoad(3), 3);
+    v = _mm_insert_epi16(v, fnLoad(4), 4);
+    v = _mm_insert_epi16(v, fnLoad(5), 5);
+    v = _mm_insert_epi16(v, fnLoad(6), 6);
+    return _mm_insert_epi16(v, fnLoad(7), 7);
+}
+
+// Eight 32-bit values.
+template <int nScale>
+inline __m256i Gather32(const void* p, const std::int64_t* o) {
+    const char* q = static_cast<const char*>(p);
+    const auto fnHalf = [&](int i) {
+        __m128i v = _mm_cvtsi32_si128(LoadBits<int>(q + nScale * o[i]));
+        v = _mm_insert_epi32(v, LoadBits<int>(q + nScale * o[i + 1]), 1);
+        v = _mm_insert_epi32(v, LoadBits<int>(q + nScale * o[i + 2]), 2);
+        return _mm_insert_epi32(v, LoadBits<int>(q + nScale * o[i + 3]), 3);
+    };
+    return _mm256_set_m128i(fnHalf(4), fnHalf(0));
+}
+
+// Four 64-bit values as a register of 32-byte size, from lane i on.
+template <int nScale>
+inline __m256i Gather64(const void* p, const std::int64_t* o, int i) {
+    const char* q = static_cast<const char*>(p);
+    const auto fnPair = [&](int k) {
+        return _mm_unpacklo_epi64(
+            _mm_loadl_epi64(reinterpret_cast<const __m128i*>(q + nScale * o[k])),
+            _mm_loadl_epi64(reinterpret_cast<const __m128i*>(q + nScale * o[k + 1])));
+    };
+    return _mm256_set_m128i(fnPair(i + 2), fnPair(i));
+}
+
+template <typename T>
+inline constexpr bool kIsSigned = T(-1) < T(0);
+
+// Eight 8-bit or 16-bit values as 32-bit integers.
+template <typename T>
+inline __m256i Widen(__m128i v) {
+    if constexpr (sizeof(T) == 1) {
+        return kIsSigned<T> ? _mm256_cvtepi8_epi32(v) : _mm256_cvtepu8_epi32(v);
+    } else {
+        return kIsSigned<T> ? _mm256_cvtepi16_epi32(v) : _mm256_cvtepu16_epi32(v);
+    }
+}
+
+// The first and the second sample of eight pairs of adjacent 8-bit samples, as 32-bit integers.
+template <typename T>
+inline void SplitPairs8(__m128i vPairs, __m256i& v0, __m256i& v1) {
+    if constexpr (kIsSigned<T>) {
+        v0 = _mm256_cvtepi16_epi32(_mm_srai_epi16(_mm_slli_epi16(vPairs, 8), 8));
+        v1 = _mm256_cvtepi16_epi32(_mm_srai_epi16(vPairs, 8));
+    } else {
+        v0 = _mm256_cvtepu16_epi32(_mm_and_si128(vPairs, _mm_set1_epi16(0xff)));
+        v1 = _mm256_cvtepu16_epi32(_mm_srli_epi16(vPairs, 8));
+    }
+}
+
+// The same for pairs of 16-bit samples.
+template <typename T>
+inline void SplitPairs16(__m256i vPairs, __m256i& v0, __m256i& v1) {
+    if constexpr (kIsSigned<T>) {
+        v0 = _mm256_srai_epi32(_mm256_slli_epi32(vPairs, 16), 16);
+        v1 = _mm256_srai_epi32(vPairs, 16);
+    } else {
+        v0 = _mm256_and_si256(vPairs, _mm256_set1_epi32(0xffff));
+        v1 = _mm256_srli_epi32(vPairs, 16);
+    }
+}
+
+// The types whose samples the functions below read; the 64-bit integers and 32U go the plain way.
+enum class Kind { eSmall8, eSmall16, eInt32, eFloat, eDouble, eOther };
+template <typename T>
+inline constexpr Kind kKind = Kind::eOther;
+template <>
+inline constexpr Kind kKind<unsigned char> = Kind::eSmall8;
+template <>
+inline constexpr Kind kKind<signed char> = Kind::eSmall8;
+template <>
+inline constexpr Kind kKind<unsigned short> = Kind::eSmall16;
+template <>
+inline constexpr Kind kKind<short> = Kind::eSmall16;
+template <>
+inline constexpr Kind kKind<int> = Kind::eInt32;
+template <>
+inline constexpr Kind kKind<float> = Kind::eFloat;
+template <>
+inline constexpr Kind kKind<double> = Kind::eDouble;
+
+template <typename T>
+inline F64 Gather(const T* p, const std::int64_t* o) {
+    if constexpr (kKind<T> == Kind::eSmall8) {
+        return FromInt32(Widen<T>(Gather8(p, o)));
+    } else if constexpr (kKind<T> == Kind::eSmall16) {
+        return FromInt32(Widen<T>(Gather16<2>(p, o)));
+    } else if constexpr (kKind<T> == Kind::eInt32) {
+        return FromInt32(Gather32<4>(p, o));
+    } else if constexpr (kKind<T> == Kind::eFloat) {
+        return FromFloat(_mm256_castsi256_ps(Gather32<4>(p, o)));
+    } else if constexpr (kKind<T> == Kind::eDouble) {
+        return FromHalves(_mm256_castsi256_pd(Gather64<8>(p, o, 0)),
+                          _mm256_castsi256_pd(Gather64<8>(p, o, 4)));
+    } else {
+        double adf[kLanes];
+        for (int i = 0; i < kLanes; ++i) {
+            adf[i] = static_cast<double>(p[o[i]]);
+        }
+        return Load(adf);
+    }
+}
+
+// Two adjacent samples at each offset.
+template <typename T>
+inline void GatherPair(const T* p, const std::int64_t* o, F64& a, F64& b) {
+    if constexpr (kKind<T> == Kind::eSmall8) {
+        __m256i v0;
+        __m256i v1;
+        SplitPairs8<T>(Gather16<1>(p, o), v0, v1);
+        a = FromInt32(v0);
+        b = FromInt32(v1);
+    } else if constexpr (kKind<T> == Kind::eSmall16) {
+        __m256i v0;
+        __m256i v1;
+        SplitPairs16<T>(Gather32<2>(p, o), v0, v1);
+        a = FromInt32(v0);
+        b = FromInt32(v1);
+    } else if constexpr (kKind<T> == Kind::eInt32 || kKind<T> == Kind::eFloat) {
+        // Lanes of v0: pairs 0 1 | 2 3, of v1: 4 5 | 6 7.
+        const __m256 v0 = _mm256_castsi256_ps(Gather64<4>(p, o, 0));
+        const __m256 v1 = _mm256_castsi256_ps(Gather64<4>(p, o, 4));
+        const __m256 vLow = _mm256_permute2f128_ps(v0, v1, 0x20);   // 0 1 | 4 5
+        const __m256 vHigh = _mm256_permute2f128_ps(v0, v1, 0x31);  // 2 3 | 6 7
+        const __m256 vFirst = _mm256_shuffle_ps(vLow, vHigh, 0x88);
+        const __m256 vSecond = _mm256_shuffle_ps(vLow, vHigh, 0xdd);
+        if constexpr (kKind<T> == Kind::eInt32) {
+            a = FromInt32(_mm256_castps_si256(vFirst));
+            b = FromInt32(_mm256_castps_si256(vSecond));
+        } else {
+            a = FromFloat(vFirst);
+            b = FromFloat(vSecond);
+        }
+    } else {
+        a = Gather(p, o);
+        b = Gather(p + 1, o);
+    }
+}
+
+// Copies the eight samples at the offsets.
+template <typename T>
+inline void CopySamples(T* t, const T* p, const std::int64_t* o) {
+    if constexpr (sizeof(T) == 1) {
+        _mm_storel_epi64(reinterpret_cast<__m128i*>(t), Gather8(p, o));
+    } else if constexpr (sizeof(T) == 2) {
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(t), Gather16<2>(p, o));
+    } else {
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(t), Gather32<4>(p, o));
+    }
+}
+
+template <typename T>
+inline void StoreSamples(T* p, F64 a) {
+    if constexpr (kKind<T> == Kind::eFloat) {
+        _mm256_storeu_ps(p, ToFloat(a));
+    } else if constexpr (kKind<T> == Kind::eDouble) {
+        Store(p, a);
+    } else if constexpr (kKind<T> == Kind::eInt32) {
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(p), ToInt32(a));
+    } else if constexpr (kKind<T> == Kind::eSmall16) {
+        _mm_storeu_si128(reinterpret_cast<__m128i*>(p), Narrow16<kIsSigned<T>>(ToInt32(a)));
+    } else if constexpr (kKind<T> == Kind::eSmall8) {
+        _mm_storel_epi64(reinterpret_cast<__m128i*>(p), Narrow8<kIsSigned<T>>(ToInt32(a)));
+    } else {
+        double adf[kLanes];
+        Store(adf, a);
+        for (int i = 0; i < kLanes; ++i) {
+            p[i] = static_cast<T>(adf[i]);
+        }
+    }
+}

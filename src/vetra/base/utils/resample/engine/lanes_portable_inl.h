@@ -1,0 +1,149 @@
+// The lane layer in portable form: four of the compiler's generic vectors of two doubles, which is
+// what a plain processor has (SSE2, NEON). Included inside a level's namespace; see stages_inl.h
+// for what a lane layer offers.
+
+constexpr int kParts = 4;
+typedef double Pair __attribute__((vector_size(16)));
+typedef std::int64_t PairMask __attribute__((vector_size(16)));
+
+struct F64 {
+    Pair v[kParts];
+};
+
+// The lanes of a comparison: all bits of a lane, or none.
+struct B64 {
+    PairMask m[kParts];
+};
+
+#define VETRA_LANES_OPERATOR(Result, op, member) \
+    inline Result operator op(F64 a, F64 b) {    \
+        Result r;                                \
+        for (int i = 0; i < kParts; ++i) {       \
+            r.member[i] = a.v[i] op b.v[i];      \
+        }                                        \
+        return r;                                \
+    }
+VETRA_LANES_OPERATOR(F64, +, v)
+VETRA_LANES_OPERATOR(F64, -, v)
+VETRA_LANES_OPERATOR(F64, *, v)
+VETRA_LANES_OPERATOR(F64, /, v)
+VETRA_LANES_OPERATOR(B64, <=, m)
+VETRA_LANES_OPERATOR(B64, <, m)
+VETRA_LANES_OPERATOR(B64, >, m)
+VETRA_LANES_OPERATOR(B64, ==, m)
+#undef VETRA_LANES_OPERATOR
+
+inline B64 operator&(B64 a, B64 b) {
+    for (int i = 0; i < kParts; ++i) {
+        a.m[i] &= b.m[i];
+    }
+    return a;
+}
+inline F64 Select(B64 m, F64 a, F64 b) {
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = m.m[i] ? a.v[i] : b.v[i];
+    }
+    return a;
+}
+
+inline F64 Set1(double df) {
+    const Pair v{df, df};
+    return {{v, v, v, v}};
+}
+inline F64 Load(const double* p) {
+    F64 a;
+    __builtin_memcpy(&a, p, sizeof a);
+    return a;
+}
+inline void Store(double* p, F64 a) { __builtin_memcpy(p, &a, sizeof a); }
+
+// The sign bits of a, or all its other bits.
+inline Pair SignPart(Pair a, bool bSign) {
+    const std::int64_t nSign = std::int64_t(std::uint64_t{1} << 63);
+    const PairMask nMask = bSign ? PairMask{nSign, nSign} : PairMask{~nSign, ~nSign};
+    return reinterpret_cast<Pair>(reinterpret_cast<PairMask>(a) & nMask);
+}
+inline Pair WithSignOf(Pair a, Pair sign) {
+    return reinterpret_cast<Pair>(reinterpret_cast<PairMask>(a) |
+                                  reinterpret_cast<PairMask>(SignPart(sign, true)));
+}
+
+inline F64 Abs(F64 a) {
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = SignPart(a.v[i], false);
+    }
+    return a;
+}
+
+// Adding 2^52 to a smaller number rounds it to a whole one, to nearest, ties to even; greater
+// numbers, infinities and NaN are whole already. The sign is kept, that of zeros too.
+inline F64 RoundEven(F64 a) {
+    const Pair whole{0x1p52, 0x1p52};
+    for (int i = 0; i < kParts; ++i) {
+        const Pair magnitude = SignPart(a.v[i], false);
+        const Pair rounded = WithSignOf((magnitude + whole) - whole, a.v[i]);
+        a.v[i] = magnitude < whole ? rounded : a.v[i];
+    }
+    return a;
+}
+inline F64 Floor(F64 a) {
+    const F64 rounded = RoundEven(a);
+    return Select(rounded > a, rounded - Set1(1.0), rounded);
+}
+
+inline unsigned Bits(B64 b) {
+    unsigned nBits = 0;
+    for (int i = 0; i < kParts; ++i) {
+        nBits |= static_cast<unsigned>((b.m[i][0] & 1) | (b.m[i][1] & 2)) << 2 * i;
+    }
+    return nBits;
+}
+inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
+    B64 b;
+    for (int i = 0; i < kParts; ++i) {
+        b.m[i] = PairMask{-std::int64_t{p[2 * i] == nValue}, -std::int64_t{p[2 * i + 1] == nValue}};
+    }
+    return b;
+}
+
+inline F64 LoadFloats(const float* p) {
+    double adf[kLanes];
+    for (int i = 0; i < kLanes; ++i) {
+        adf[i] = static_cast<double>(p[i]);
+    }
+    return Load(adf);
+}
+inline void StoreIntegers(std::int64_t* p, F64 a) {
+    for (int i = 0; i < kLanes; ++i) {
+        p[i] = static_cast<std::int64_t>(a.v[i / 2][i % 2]);
+    }
+}
+
+template <typename T>
+inline F64 Gather(const T* p, const std::int64_t* panOffset) {
+    F64 a;
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = Pair{static_cast<double>(p[panOffset[2 * i]]),
+                      static_cast<double>(p[panOffset[2 * i + 1]])};
+    }
+    return a;
+}
+template <typename T>
+inline void GatherPair(const T* p, const std::int64_t* panOffset, F64& a, F64& b) {
+    a = Gather(p, panOffset);
+    b = Gather(p + 1, panOffset);
+}
+
+template <typename T>
+inline void CopySamples(T* t, const T* p, const std::int64_t* panOffset) {
+    for (int i = 0; i < kLanes; ++i) {
+        t[i] = p[panOffset[i]];
+    }
+}
+
+template <typename T>
+inline void StoreSamples(T* p, F64 a) {
+    for (int i = 0; i < kLanes; ++i) {
+        p[i] = static_cast<T>(a.v[i / 2][i % 2]);
+    }
+}

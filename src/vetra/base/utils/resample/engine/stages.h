@@ -1,0 +1,135 @@
+#ifndef VETRA_BASE_UTILS_RESAMPLE_ENGINE_STAGES_H
+#define VETRA_BASE_UTILS_RESAMPLE_ENGINE_STAGES_H
+
+#include <cstdint>
+
+// What the sampling loop hands to the stages that are compiled once per processor level. Plain data
+// and no functions: code of a header that every level includes could be merged by the linker into
+// one copy, built for a processor that this machine isn't.
+namespace vetra::utils::engine {
+
+/// Pixels that go through the stages together; their arrays fit into the first-level cache. A
+/// multiple of kLanes, so that stages work on whole groups and never look at a rest.
+constexpr int kSpanPixels = 128;
+/// Pixels that the lane layer treats at once.
+constexpr int kLanes = 8;
+
+/// The ten real sample types, by type code.
+constexpr int kNumSampleTypes = 10;
+
+/// Class bits of a position.
+constexpr unsigned char kClassFits = 1;  ///< the method's window lies inside the source
+constexpr unsigned char kClassNear = 2;  ///< the nearest pixel lies inside the source
+
+/// Where the classes of a position change, in whole pixel coordinates: a window fits while the
+/// anchor is from first to last, both included.
+struct ClassLimits {
+    double dfFitColFirst;
+    double dfFitColLast;
+    double dfFitRowFirst;
+    double dfFitRowLast;
+    double dfNearColLast;
+    double dfNearRowLast;
+    bool bAnchorNearest;  ///< the anchor is the nearest pixel, not the floor
+};
+
+/// Corner positions of a bilinear transform, and its size.
+struct BilinearCorners {
+    double adfCol[4];
+    double adfRow[4];
+    int nCols;
+    int nRows;
+};
+
+/// The windows of a span, in mode 1, as the methods see them. Pixels of other modes have offset 0:
+/// a stage may compute them, but nobody uses what comes out.
+struct WindowSpan {
+    /// Of each window's first sample from pSrc, in samples; kSpanPixels of them.
+    const std::int64_t* panOffset;
+    /// Position minus anchor.
+    const double* padfFracCol;
+    const double* padfFracRow;
+    /// Modes of the pixels, when others than 1 occur, else null.
+    const unsigned char* pabyMode;
+    int nPix;
+    /// Samples from a row of the source to the next.
+    std::int64_t nPitch;
+    /// Samples from a pixel to the next.
+    int nChan;
+    /// All pixels share the first row fraction: the transform is axis-aligned.
+    bool bOneRow;
+};
+
+/// What a store stage knows of the output type's clamp.
+template <typename T>
+struct StoreLimits {
+    T low;
+    T high;
+    T background;
+    bool bAvoid;    ///< keep values off the background
+    T tolerance;    ///< how near to the background is too near (floating types)
+    T replacement;  ///< what a value too near becomes
+};
+
+/// Computes kSpanPixels-wide arrays of values from samples of one channel. pSrc points at the
+/// channel's first sample, pParameters at what the method prepared for the run.
+using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, const void* pParameters,
+                                double* padfValue);
+/// Reads the samples at panOffset of the pixels whose mode is 2.
+using NearestFunction = void (*)(const void* pSrc, const std::int64_t* panOffset,
+                                 const unsigned char* pabyMode, int nPix, double* padfValue);
+/// Turns nPix values, rounded up to whole groups, into samples. pLimits is a StoreLimits<T>.
+using StoreFunction = void (*)(const double* padfValue, int nPix, const void* pLimits,
+                               void* pSamples);
+/// Copies the pixels at panOffset, all channels, to pTgt.
+using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
+                              void* pTgt);
+/// Clamps samples of an integer type in place.
+using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void* pLimits);
+
+/// The stages of one processor level.
+struct LevelStages {
+    const char* pszName;
+
+    // Positions: kSpanPixels columns and rows from the first nPix source values.
+    void (*pfnArrayPositions)(const float* pafCol, const float* pafRow, double dfColOff,
+                              double dfRowOff, int nPix, double* padfCol, double* padfRow);
+    /// The first pixel is column nX of row nY; all lie in one row.
+    void (*pfnBilinearPositions)(const BilinearCorners& oCorners, std::int64_t nX, std::int64_t nY,
+                                 int nPix, double* padfCol, double* padfRow);
+
+    // Modes.
+    /// Class bits of each position.
+    void (*pfnClasses)(const ClassLimits& oLimits, const double* padfCol, const double* padfRow,
+                       int nPix, unsigned char* pabyClass);
+    /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
+    /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
+    /// of modes (1 << mode).
+    unsigned (*pfnOpenModes)(const ClassLimits& oLimits, bool bWindow, unsigned char nFallback,
+                             const double* padfCol, const double* padfRow, int nPix,
+                             unsigned char* pabyMode);
+
+    // Places: where the samples of the pixels of one mode start.
+    /// Windows: offsets of the first sample and fractions, 0 where the mode isn't 1 (pabyMode may
+    /// be null: all are 1).
+    void (*pfnWindows)(bool bAnchorNearest, double dfColOff, double dfRowOff, double dfPitch,
+                       double dfChan, const double* padfCol, const double* padfRow,
+                       const unsigned char* pabyMode, int nPix, std::int64_t* panOffset,
+                       double* padfFracCol, double* padfFracRow);
+    /// Nearest pixels: their offsets, 0 where the mode isn't 2 (pabyMode may be null: all are 2).
+    void (*pfnNearestPlaces)(double dfPitch, double dfChan, const double* padfCol,
+                             const double* padfRow, const unsigned char* pabyMode, int nPix,
+                             std::int64_t* panOffset);
+
+    // Values and stores, by sample type.
+    ValuesFunction apfnBilinear[kNumSampleTypes];
+    NearestFunction apfnNearest[kNumSampleTypes];
+    StoreFunction apfnStore[kNumSampleTypes];
+    /// Null for the types whose samples may change on their way through a double.
+    CopyFunction apfnCopy[kNumSampleTypes];
+    ClampFunction apfnClamp[kNumSampleTypes];
+};
+
+}  // namespace vetra::utils::engine
+
+#endif  // VETRA_BASE_UTILS_RESAMPLE_ENGINE_STAGES_H

@@ -1,0 +1,422 @@
+// The stages of the sampling loop, compiled once per processor level. A level's source defines
+// VETRA_LEVEL, its namespace, and VETRA_LANES, its lane layer, and includes this file.
+//
+// Everything stands in the level's namespace and nothing of the standard library is called, so that
+// no code built for one processor can be linked into another's path.
+//
+// The lane layer works on eight pixels at a time, each in a lane of its own, and every lane does
+// the operations of a plain evaluation in the plain order; so all levels give the same bits. It
+// offers
+//   F64, B64                     eight doubles; eight truth values
+//   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
+//   Set1 Load Store LoadFloats   from and to memory, aligned or not
+//   Floor RoundEven Abs          RoundEven: to nearest, ties to even
+//   Bits BytesEqual              truth values as bits; which of eight bytes have a value
+//   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
+//   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
+//   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
+//   StoreSamples                 eight values that T can hold (float: rounds to nearest)
+
+#include <cfloat>
+#include <cstdint>
+
+#if defined(__x86_64__)
+#include <immintrin.h>
+#endif
+
+#include "vetra/base/utils/resample/engine/stages.h"
+
+static_assert(FLT_EVAL_METHOD == 0, "double arithmetic must be done in double");
+
+namespace vetra::utils::engine::VETRA_LEVEL {
+
+namespace {
+
+#include VETRA_LANES
+
+// Eight bytes: bit 0 of each from nBits0, bit 1 from nBits1.
+inline void StoreBits(unsigned char* p, unsigned nBits0, unsigned nBits1) {
+#if defined(__BMI2__)
+    constexpr std::uint64_t nLowest = 0x0101010101010101u;
+    const std::uint64_t nBytes = _pdep_u64(nBits0, nLowest) | _pdep_u64(nBits1, nLowest << 1);
+    __builtin_memcpy(p, &nBytes, sizeof nBytes);
+#else
+    for (int i = 0; i < kLanes; ++i) {
+        p[i] = static_cast<unsigned char>((nBits0 >> i & 1u) | (nBits1 >> i & 1u) << 1);
+    }
+#endif
+}
+
+inline bool AnyByteEquals(const unsigned char* p, unsigned char nValue) {
+    return Bits(BytesEqual(p, nValue)) != 0;
+}
+
+// ---- Positions ----
+
+void ArrayPositions(const float* pafCol, const float* pafRow, double dfColOff, double dfRowOff,
+                    int nPix, double* padfCol, double* padfRow) {
+    const F64 vColOff = Set1(dfColOff);
+    const F64 vRowOff = Set1(dfRowOff);
+    int i = 0;
+    for (; i + kLanes <= nPix; i += kLanes) {
+        Store(padfCol + i, LoadFloats(pafCol + i) + vColOff);
+        Store(padfRow + i, LoadFloats(pafRow + i) + vRowOff);
+    }
+    for (; i < nPix; ++i) {
+        padfCol[i] = static_cast<double>(pafCol[i]) + dfColOff;
+        padfRow[i] = static_cast<double>(pafRow[i]) + dfRowOff;
+    }
+}
+
+void BilinearPositions(const BilinearCorners& oCorners, std::int64_t nX, std::int64_t nY, int nPix,
+                       double* padfCol, double* padfRow) {
+    static const double kadfSteps[kLanes] = {0, 1, 2, 3, 4, 5, 6, 7};
+    const F64 one = Set1(1.0);
+    const bool bWide = oCorners.nCols > 1;
+    const F64 vSpan = Set1(bWide ? oCorners.nCols - 1 : 1.0);
+    const double dfV = oCorners.nRows > 1 ? static_cast<double>(nY) / (oCorners.nRows - 1) : 0.0;
+    const F64 v = Set1(dfV);
+    const auto fnPosition = [&](const double* padfCorner, F64 u) {
+        return ((one - u) * Set1(padfCorner[2]) + u * Set1(padfCorner[3])) * v +
+               ((one - u) * Set1(padfCorner[0]) + u * Set1(padfCorner[1])) * (one - v);
+    };
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 x = Set1(static_cast<double>(nX + i)) + Load(kadfSteps);
+        const F64 u = bWide ? x / vSpan : Set1(0.0);
+        Store(padfCol + i, fnPosition(oCorners.adfCol, u));
+        Store(padfRow + i, fnPosition(oCorners.adfRow, u));
+    }
+}
+
+// ---- Modes ----
+
+struct Limits {
+    explicit Limits(const ClassLimits& o)
+        : fitColFirst(Set1(o.dfFitColFirst)),
+          fitColLast(Set1(o.dfFitColLast)),
+          fitRowFirst(Set1(o.dfFitRowFirst)),
+          fitRowLast(Set1(o.dfFitRowLast)),
+          nearColLast(Set1(o.dfNearColLast)),
+          nearRowLast(Set1(o.dfNearRowLast)) {}
+
+    unsigned Fit(F64 col, F64 row) const {
+        return Bits((fitColFirst <= col) & (col <= fitColLast) & (fitRowFirst <= row) &
+                    (row <= fitRowLast));
+    }
+    unsigned Near(F64 col, F64 row) const {
+        const F64 zero = Set1(0.0);
+        return Bits((zero <= col) & (col <= nearColLast) & (zero <= row) & (row <= nearRowLast));
+    }
+
+    F64 fitColFirst, fitColLast, fitRowFirst, fitRowLast, nearColLast, nearRowLast;
+};
+
+inline F64 Nearest(F64 pos) { return Floor(pos + Set1(0.5)); }
+
+inline unsigned FitBits(const Limits& oLimits, bool bAnchorNearest, F64 col, F64 row) {
+    return bAnchorNearest ? oLimits.Fit(Nearest(col), Nearest(row))
+                          : oLimits.Fit(Floor(col), Floor(row));
+}
+
+void Classes(const ClassLimits& oClassLimits, const double* padfCol, const double* padfRow,
+             int nPix, unsigned char* pabyClass) {
+    const Limits oLimits(oClassLimits);
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        StoreBits(pabyClass + i, FitBits(oLimits, oClassLimits.bAnchorNearest, col, row),
+                  oLimits.Near(Nearest(col), Nearest(row)));
+    }
+}
+
+unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char nFallback,
+                   const double* padfCol, const double* padfRow, int nPix,
+                   unsigned char* pabyMode) {
+    const Limits oLimits(oClassLimits);
+    unsigned nFitAny = 0;
+    unsigned nNearAny = 0;
+    unsigned nNoneAny = 0;
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        const unsigned nFit =
+            bWindow ? FitBits(oLimits, oClassLimits.bAnchorNearest, col, row) : 0u;
+        unsigned nNear = 0;
+        if (nFit != 0xffu && nFallback != 0) {
+            nNear = oLimits.Near(Nearest(col), Nearest(row)) & ~nFit;
+        }
+        StoreBits(pabyMode + i, nFit, nNear);
+        nFitAny |= nFit;
+        nNearAny |= nNear;
+        nNoneAny |= ~(nFit | nNear) & 0xffu;
+    }
+    return (nNoneAny != 0 ? 1u : 0u) | (nFitAny != 0 ? 2u : 0u) | (nNearAny != 0 ? 4u : 0u);
+}
+
+// ---- Places ----
+
+void Windows(bool bAnchorNearest, double dfColOff, double dfRowOff, double dfPitch, double dfChan,
+             const double* padfCol, const double* padfRow, const unsigned char* pabyMode, int nPix,
+             std::int64_t* panOffset, double* padfFracCol, double* padfFracRow) {
+    // Offsets are whole numbers below 2^53, so exact in double.
+    const F64 pitch = Set1(dfPitch);
+    const F64 chan = Set1(dfChan);
+    const F64 first = Set1(dfRowOff * dfPitch + dfColOff * dfChan);
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        const F64 anchorCol = bAnchorNearest ? Nearest(col) : Floor(col);
+        const F64 anchorRow = bAnchorNearest ? Nearest(row) : Floor(row);
+        F64 offset = anchorRow * pitch + anchorCol * chan + first;
+        if (pabyMode != nullptr) {
+            offset = Select(BytesEqual(pabyMode + i, 1), offset, Set1(0.0));
+        }
+        StoreIntegers(panOffset + i, offset);
+        Store(padfFracCol + i, col - anchorCol);
+        Store(padfFracRow + i, row - anchorRow);
+    }
+}
+
+void NearestPlaces(double dfPitch, double dfChan, const double* padfCol, const double* padfRow,
+                   const unsigned char* pabyMode, int nPix, std::int64_t* panOffset) {
+    const F64 pitch = Set1(dfPitch);
+    const F64 chan = Set1(dfChan);
+    for (int i = 0; i < nPix; i += kLanes) {
+        F64 offset = Nearest(Load(padfRow + i)) * pitch + Nearest(Load(padfCol + i)) * chan;
+        if (pabyMode != nullptr) {
+            offset = Select(BytesEqual(pabyMode + i, 2), offset, Set1(0.0));
+        }
+        StoreIntegers(panOffset + i, offset);
+    }
+}
+
+// ---- Values ----
+
+// Whether samples of this type can make a NaN.
+template <typename T>
+inline constexpr bool kIsFloating = T(0.5) != T(0);
+
+// The windows of eight pixels, for one channel.
+template <typename T, bool kSingleChannel>
+struct WindowReader {
+    const T* pFirst;
+    const std::int64_t* panOffset;
+    std::int64_t nPitch;
+    int nChan;
+
+    // The first two samples of window row nRow.
+    void Pair(int nRow, F64& a, F64& b) const {
+        const T* p = pFirst + nRow * nPitch;
+        if constexpr (kSingleChannel) {
+            GatherPair(p, panOffset, a, b);
+        } else {
+            a = Gather(p, panOffset);
+            b = Gather(p + nChan, panOffset);
+        }
+    }
+};
+
+template <typename Method, typename T, bool kSingleChannel, bool kOneRow>
+void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
+    for (int i = 0; i < oSpan.nPix; i += kLanes) {
+        if (oSpan.pabyMode != nullptr && !AnyByteEquals(oSpan.pabyMode + i, 1)) {
+            continue;
+        }
+        const F64 dx = Load(oSpan.padfFracCol + i);
+        const F64 dy = kOneRow ? Set1(oSpan.padfFracRow[0]) : Load(oSpan.padfFracRow + i);
+        const WindowReader<T, kSingleChannel> oWindow{pSrc, oSpan.panOffset + i, oSpan.nPitch,
+                                                      oSpan.nChan};
+        F64 value = Method::Value(oWindow, dx, dy);
+        if constexpr (kIsFloating<T>) {
+            // Which bits a NaN gets from arithmetic depends on the processor and on the order of
+            // operands, which a compiler may exchange.
+            value = Select(value == value, value, Set1(__builtin_nan("")));
+        }
+        Store(padfValue + i, value);
+    }
+}
+
+template <typename Method, typename T>
+void Values(const WindowSpan& oSpan, const void* pSrc, const void*, double* padfValue) {
+    const T* p = static_cast<const T*>(pSrc);
+    if (oSpan.nChan == 1) {
+        oSpan.bOneRow ? ValuesLoop<Method, T, true, true>(oSpan, p, padfValue)
+                      : ValuesLoop<Method, T, true, false>(oSpan, p, padfValue);
+    } else {
+        oSpan.bOneRow ? ValuesLoop<Method, T, false, true>(oSpan, p, padfValue)
+                      : ValuesLoop<Method, T, false, false>(oSpan, p, padfValue);
+    }
+}
+
+template <typename T>
+void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsigned char* pabyMode,
+                   int nPix, double* padfValue) {
+    const T* p = static_cast<const T*>(pSrc);
+    if (pabyMode == nullptr) {
+        for (int i = 0; i < nPix; i += kLanes) {
+            Store(padfValue + i, Gather(p, panOffset + i));
+        }
+        return;
+    }
+    for (int i = 0; i < nPix; ++i) {
+        if (pabyMode[i] == 2) {
+            padfValue[i] = static_cast<double>(p[panOffset[i]]);
+        }
+    }
+}
+
+#include "vetra/base/utils/resample/algorithm/bilinear_inl.h"
+
+// ---- Stores ----
+
+// A rounded double as a 64-bit integer; it saturates, and a NaN gives the lowest value.
+template <typename T>
+inline T ToInteger64(double df) {
+    constexpr bool bSigned = T(-1) < T(0);
+    constexpr double dfEnd = bSigned ? 0x1p63 : 0x1p64;
+    constexpr T lowest = bSigned ? static_cast<T>(T(1) << 63) : T(0);
+    if (!(df > (bSigned ? -dfEnd : 0.0))) {
+        return lowest;
+    }
+    return df >= dfEnd ? static_cast<T>(~lowest) : static_cast<T>(df);
+}
+
+template <typename T>
+void StoreFloating(const double* padfValue, int nPix, const StoreLimits<T>& oLimits, T* p) {
+    const F64 low = Set1(static_cast<double>(oLimits.low));
+    const F64 high = Set1(static_cast<double>(oLimits.high));
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 v = Load(padfValue + i);
+        StoreSamples(p + i, Select(v < low, low, Select(v > high, high, v)));
+    }
+    if (oLimits.bAvoid) {
+        const double dfBackground = static_cast<double>(oLimits.background);
+        const double dfTolerance = static_cast<double>(oLimits.tolerance);
+        for (int i = 0; i < nPix; ++i) {
+            const double dfDistance = __builtin_fabs(static_cast<double>(p[i]) - dfBackground);
+            p[i] = dfDistance < dfTolerance ? oLimits.replacement : p[i];
+        }
+    }
+}
+
+template <typename T>
+void StoreInteger(const double* padfValue, int nPix, const StoreLimits<T>& oLimits, T* p) {
+    const F64 low = Set1(static_cast<double>(oLimits.low));
+    const F64 high = Set1(static_cast<double>(oLimits.high));
+    const F64 background = Set1(static_cast<double>(oLimits.background));
+    const F64 replacement = Set1(static_cast<double>(oLimits.replacement));
+    for (int i = 0; i < nPix; i += kLanes) {
+        F64 v = RoundEven(Load(padfValue + i));
+        // In this order: the limits can be crossed. A NaN takes the low limit.
+        v = Select(low <= v, Select(v > high, high, v), low);
+        if (oLimits.bAvoid) {
+            v = Select(v == background, replacement, v);
+        }
+        StoreSamples(p + i, v);
+    }
+}
+
+// Limits of 64-bit integers may have no double of their own: clamped as integers.
+template <typename T>
+void StoreInteger64(const double* padfValue, int nPix, const StoreLimits<T>& oLimits, T* p) {
+    for (int i = 0; i < nPix; i += kLanes) {
+        double adf[kLanes];
+        Store(adf, RoundEven(Load(padfValue + i)));
+        for (int k = 0; k < kLanes; ++k) {
+            T v = ToInteger64<T>(adf[k]);
+            v = v < oLimits.low ? oLimits.low : v > oLimits.high ? oLimits.high : v;
+            p[i + k] = oLimits.bAvoid && v == oLimits.background ? oLimits.replacement : v;
+        }
+    }
+}
+
+template <typename T>
+void StoreValues(const double* padfValue, int nPix, const void* pLimits, void* pSamples) {
+    const StoreLimits<T>& oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
+    T* p = static_cast<T*>(pSamples);
+    if constexpr (kIsFloating<T>) {
+        StoreFloating(padfValue, nPix, oLimits, p);
+    } else if constexpr (sizeof(T) == 8) {
+        StoreInteger64(padfValue, nPix, oLimits, p);
+    } else {
+        StoreInteger(padfValue, nPix, oLimits, p);
+    }
+}
+
+template <typename T>
+void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan, void* pTgt) {
+    const T* p = static_cast<const T*>(pSrc);
+    T* t = static_cast<T*>(pTgt);
+    if (nChan == 1) {
+        int i = 0;
+        for (; i + kLanes <= nPix; i += kLanes) {
+            CopySamples(t + i, p, panOffset + i);
+        }
+        for (; i < nPix; ++i) {
+            t[i] = p[panOffset[i]];
+        }
+        return;
+    }
+    for (int i = 0; i < nPix; ++i) {
+        const T* pPixel = p + panOffset[i];
+        for (int c = 0; c < nChan; ++c) {
+            *t++ = pPixel[c];
+        }
+    }
+}
+
+template <typename T>
+void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
+    const StoreLimits<T> oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
+    T* p = static_cast<T*>(pSamples);
+    for (std::int64_t i = 0; i < nSamples; ++i) {
+        const T v = p[i];
+        p[i] = v < oLimits.low ? oLimits.low : v > oLimits.high ? oLimits.high : v;
+    }
+    if (oLimits.bAvoid) {
+        for (std::int64_t i = 0; i < nSamples; ++i) {
+            p[i] = p[i] == oLimits.background ? oLimits.replacement : p[i];
+        }
+    }
+}
+
+}  // namespace
+
+// One entry per sample type, in the order of the type codes.
+#define VETRA_PER_TYPE(Function)                                                                   \
+    {                                                                                              \
+        Function(unsigned char), Function(signed char), Function(unsigned short), Function(short), \
+            Function(unsigned int), Function(int), Function(float), Function(std::uint64_t),       \
+            Function(std::int64_t), Function(double)                                               \
+    }
+#define VETRA_PER_SHORT_INTEGER(Function)                                                          \
+    {                                                                                              \
+        Function(unsigned char), Function(signed char), Function(unsigned short), Function(short), \
+            Function(unsigned int), Function(int), nullptr, nullptr, nullptr, nullptr              \
+    }
+#define VETRA_BILINEAR(T) &Values<Bilinear, T>
+#define VETRA_NEAREST(T) &NearestValues<T>
+#define VETRA_STORE(T) &StoreValues<T>
+#define VETRA_COPY(T) &CopyPixels<T>
+#define VETRA_CLAMP(T) &ClampSamples<T>
+
+#define VETRA_TEXT(x) #x
+#define VETRA_NAME(x) VETRA_TEXT(x)
+
+extern const LevelStages kStages;
+const LevelStages kStages = {
+    VETRA_NAME(VETRA_LEVEL),
+    &ArrayPositions,
+    &BilinearPositions,
+    &Classes,
+    &OpenModes,
+    &Windows,
+    &NearestPlaces,
+    VETRA_PER_TYPE(VETRA_BILINEAR),
+    VETRA_PER_TYPE(VETRA_NEAREST),
+    VETRA_PER_TYPE(VETRA_STORE),
+    VETRA_PER_SHORT_INTEGER(VETRA_COPY),
+    VETRA_PER_SHORT_INTEGER(VETRA_CLAMP),
+};
+
+}  // namespace vetra::utils::engine::VETRA_LEVEL

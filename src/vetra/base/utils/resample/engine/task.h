@@ -1,0 +1,65 @@
+#ifndef VETRA_BASE_UTILS_RESAMPLE_ENGINE_TASK_H
+#define VETRA_BASE_UTILS_RESAMPLE_ENGINE_TASK_H
+
+#include "vetra/base/utils/resample/engine/levels.h"
+#include "vetra/base/utils/resample/engine/pixelmode.h"
+#include "vetra/base/utils/resample/postfm/ibufpostfm.h"
+
+namespace vetra::utils::engine {
+
+/// A sampling method, as the loop sees it: its window, how it decides what becomes of a pixel, and
+/// where its values stage stands in a level's table.
+struct Method {
+    ModeRule eRule;
+    Window oWindow;
+    /// Null for a method without a window.
+    ValuesFunction (LevelStages::*papfnValues)[kNumSampleTypes];
+};
+
+/// What a run can be asked for beyond its result. The defaults are what every caller gets; tests
+/// ask for the rest.
+struct RunOptions {
+    /// Takes what became of each target pixel; may be null.
+    unsigned char* pabyOutcome = nullptr;
+    Level eLevel = GetBestLevel();
+    /// Allow the shortcuts for axis-aligned transforms and plain copies.
+    bool bShortcuts = true;
+};
+
+/// One run of the sampling loop, with the sample types as codes.
+struct Task {
+    const void* pSrc;
+    int nSrcCols;
+    int nSrcRows;
+    const unsigned char* pabySrcMask;
+    int nSrcType;  ///< index into the stage tables
+
+    void* pTgt;
+    int nTgtCols;
+    int nTgtRows;
+    const unsigned char* pabyTgtMask;
+    int nTgtType;
+
+    int nChan;
+    const IBufPosTfm* poTfm;
+    NodataFillAction eFillAction;
+    const Method* poMethod;
+    /// What the method prepared for the run; may be null.
+    const void* pParameters;
+    /// A StoreLimits of the target's type.
+    const void* pLimits;
+    /// One sample of the target's type.
+    const void* pBackground;
+    /// Every sample of the target's type passes the clamp unchanged.
+    bool bClampIsOpen;
+
+    RunOptions oOptions;
+};
+
+/// Runs the sampling loop on an OpenMP team. Throws std::bad_alloc, before any pixel is written,
+/// and nothing else.
+void Execute(const Task& oTask);
+
+}  // namespace vetra::utils::engine
+
+#endif  // VETRA_BASE_UTILS_RESAMPLE_ENGINE_TASK_H
