@@ -85,10 +85,13 @@ unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
     return nModes;
 }
 
-// What an axis-aligned run tabulates per target column. Places of columns outside have offset 0.
+// What an axis-aligned run tabulates per target column. The places of columns outside are 0.
 struct ColumnTables {
     std::vector<double> vdfPosition;
     std::vector<double> vdfFrac;
+    // Of windows and nearest pixels: source columns, and offsets of samples.
+    std::vector<std::int64_t> vnWindowCol;
+    std::vector<std::int64_t> vnNearestCol;
     std::vector<std::int64_t> vnWindow;
     std::vector<std::int64_t> vnNearest;
     std::vector<unsigned char> vbyClass;
@@ -118,8 +121,9 @@ class Run {
     void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
                  ValueArrays& oValues) const;
 
-    void ChooseModes(long long nFirst, int nPix, const double* padfCol, const double* padfRow,
-                     int nRowStep, unsigned char* pabyClassThenMode) const;
+    void ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
+                     long long nWindowShift, const std::int64_t* panNearest,
+                     long long nNearestShift, unsigned char* pabyClassThenMode) const;
 
     void Finish(const Span& oSpan, ValueArrays& oValues) const;
     void CopyRuns(const Span& oSpan) const;
@@ -127,9 +131,8 @@ class Run {
     template <typename Bits>
     void Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const;
 
-    const char* SrcSample(long long nRow, int nCol) const {
-        return static_cast<const char*>(moTask.pSrc) +
-               (nRow * mnPitch + static_cast<long long>(nCol) * moTask.nChan) * mnSrcBytes;
+    const char* SrcRow(long long nRow) const {
+        return static_cast<const char*>(moTask.pSrc) + nRow * mnPitch * mnSrcBytes;
     }
     char* TgtPixel(long long nPixel) const {
         return static_cast<char*>(moTask.pTgt) + nPixel * moTask.nChan * mnTgtBytes;
@@ -158,7 +161,7 @@ Run::Run(const Task& oTask)
       moMethod(*oTask.poMethod),
       moStages(GetStages(oTask.oOptions.eLevel)),
       moPositions(*oTask.poTfm),
-      moChooser(moMethod.eRule, moMethod.oWindow, oTask.pabySrcMask, oTask.nSrcCols, oTask.nSrcRows,
+      moChooser(moMethod.eRule, moMethod.oWindow, oTask.pabySrcMask, oTask.nSrcCols,
                 oTask.eFillAction),
       mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
       mnPitch(static_cast<long long>(oTask.nSrcCols) * oTask.nChan),
@@ -172,6 +175,8 @@ Run::Run(const Task& oTask)
     moLimits.dfNearColLast = oTask.nSrcCols - 1.0;
     moLimits.dfNearRowLast = oTask.nSrcRows - 1.0;
     moLimits.bAnchorNearest = oWindow.bAnchorNearest;
+    moLimits.dfColOff = oWindow.nColOff;
+    moLimits.dfRowOff = oWindow.nRowOff;
 
     const bool bNearest = moMethod.eRule == ModeRule::eNearestSample;
     mnFallback = bNearest || oTask.eFillAction != eNFA_BGD ? ePO_NEAREST : ePO_BACKGROUND;
@@ -195,45 +200,36 @@ unsigned char Run::OpenMode(unsigned char nClass) const {
 
 void Run::MakeColumnTables() {
     const int nCols = moTask.nTgtCols;
+    // Groups reach beyond the last column; the entries there are 0.
     const std::size_t nSize = static_cast<std::size_t>(nCols) + kSpanArray;
     moColumns.vdfPosition.resize(nSize);
     moColumns.vdfFrac.resize(nSize);
-    moColumns.vnWindow.resize(nSize);
-    moColumns.vnNearest.resize(nSize);
+    moColumns.vnWindowCol.resize(nSize);
+    moColumns.vnNearestCol.resize(nSize);
     moColumns.vbyClass.resize(nSize);
-    std::vector<double> vdfRow(kSpanArray);
+    // Of the first source row, to which no window is tied: what remains is the column's part.
+    ClassLimits oLimits = moLimits;
+    oLimits.dfFitRowFirst = 0.0;
+    oLimits.dfFitRowLast = 0.0;
+    oLimits.dfRowOff = 0.0;
+    double adfRow[kSpanArray];
     for (int nX = 0; nX < nCols; nX += kSpanPixels) {
         const int nPix = std::min(kSpanPixels, nCols - nX);
         double* padfCol = moColumns.vdfPosition.data() + nX;
-        moPositions.Fill(moStages, nX, nPix, padfCol, vdfRow.data());
-        // Any row inside will do: only the column's part of the class and the places are kept.
-        std::fill(vdfRow.begin(), vdfRow.end(), 0.0);
-        ClassLimits oColumnLimits = moLimits;
-        oColumnLimits.dfFitRowFirst = 0.0;
-        oColumnLimits.dfFitRowLast = 0.0;
-        unsigned char* pabyClass = moColumns.vbyClass.data() + nX;
-        moStages.pfnClasses(oColumnLimits, padfCol, vdfRow.data(), nPix, pabyClass);
-        unsigned char abyMode[kSpanArray] = {};
-        for (int i = 0; i < nPix; ++i) {
-            abyMode[i] = (pabyClass[i] & kClassFits) != 0 ? ePO_INTERPOLATED : ePO_BACKGROUND;
-        }
-        double adfUnused[kSpanArray];
-        moStages.pfnWindows(moLimits.bAnchorNearest, moMethod.oWindow.nColOff, 0.0, 0.0,
-                            moTask.nChan, padfCol, vdfRow.data(), abyMode, nPix,
-                            moColumns.vnWindow.data() + nX, moColumns.vdfFrac.data() + nX,
-                            adfUnused);
-        for (int i = 0; i < nPix; ++i) {
-            abyMode[i] = (pabyClass[i] & kClassNear) != 0 ? ePO_NEAREST : ePO_BACKGROUND;
-        }
-        moStages.pfnNearestPlaces(0.0, moTask.nChan, padfCol, vdfRow.data(), abyMode, nPix,
-                                  moColumns.vnNearest.data() + nX);
+        moPositions.Fill(moStages, nX, nPix, padfCol, adfRow);
+        std::fill_n(adfRow, kSpanArray, 0.0);
+        moStages.pfnClasses(oLimits, moTask.nSrcCols, padfCol, adfRow, nPix,
+                            moColumns.vbyClass.data() + nX, moColumns.vnWindowCol.data() + nX,
+                            moColumns.vnNearestCol.data() + nX);
     }
-    // The entries behind the last column belong to no pixel; groups that reach into them stay in
-    // the source.
-    for (std::size_t i = static_cast<std::size_t>(nCols); i < nSize; ++i) {
-        moColumns.vnWindow[i] = 0;
-        moColumns.vnNearest[i] = 0;
-        moColumns.vbyClass[i] = 0;
+    moColumns.vnWindow = moColumns.vnWindowCol;
+    moColumns.vnNearest = moColumns.vnNearestCol;
+    for (std::size_t i = 0; i < nSize; ++i) {
+        const double dfPosition = moColumns.vdfPosition[i];
+        moColumns.vdfFrac[i] =
+            dfPosition - std::floor(moLimits.bAnchorNearest ? dfPosition + 0.5 : dfPosition);
+        moColumns.vnWindow[i] *= moTask.nChan;
+        moColumns.vnNearest[i] *= moTask.nChan;
     }
     for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
         auto& vbyMode = moColumns.avbyMode[nRowClass];
@@ -270,15 +266,15 @@ void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
         oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.papfnValues != nullptr, mnFallback,
                                              oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
     } else {
-        moStages.pfnClasses(moLimits, oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
-        ChooseModes(nFirst, nPix, oArrays.adfCol, oArrays.adfRow, 1, oArrays.abyMode);
+        moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
+                            oArrays.abyMode, oArrays.anWindow, oArrays.anNearest);
+        ChooseModes(nFirst, nPix, oArrays.anWindow, 0, oArrays.anNearest, 0, oArrays.abyMode);
         oSpan.nModes = SetOfModes(oArrays.abyMode, nPix);
     }
     if ((oSpan.nModes & kSetInterpolated) != 0) {
-        moStages.pfnWindows(moLimits.bAnchorNearest, moMethod.oWindow.nColOff,
-                            moMethod.oWindow.nRowOff, static_cast<double>(mnPitch), moTask.nChan,
-                            oArrays.adfCol, oArrays.adfRow, oSpan.ModesUnless(kSetInterpolated),
-                            nPix, oArrays.anWindow, oArrays.adfFracCol, oArrays.adfFracRow);
+        moStages.pfnWindows(moLimits, static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
+                            oArrays.adfRow, oSpan.ModesUnless(kSetInterpolated), nPix,
+                            oArrays.anWindow, oArrays.adfFracCol, oArrays.adfFracRow);
     }
     if ((oSpan.nModes & kSetNearest) != 0) {
         moStages.pfnNearestPlaces(static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
@@ -312,16 +308,18 @@ void Run::Prefetch(const Span& oSpan) const {
     }
 }
 
-// Turns classes into modes. nRowStep is 0 where all pixels share the first row position.
-void Run::ChooseModes(long long nFirst, int nPix, const double* padfCol, const double* padfRow,
-                      int nRowStep, unsigned char* pabyClassThenMode) const {
+// Turns classes into modes. The shifts lead from the indices to source pixels.
+void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
+                      long long nWindowShift, const std::int64_t* panNearest,
+                      long long nNearestShift, unsigned char* pabyClassThenMode) const {
     const unsigned char* pabyRequest =
         moTask.pabyTgtMask == nullptr ? nullptr : moTask.pabyTgtMask + nFirst;
     for (int i = 0; i < nPix; ++i) {
         const unsigned char nRequest =
             pabyRequest == nullptr ? static_cast<unsigned char>(1) : pabyRequest[i];
         pabyClassThenMode[i] =
-            moChooser.Choose(nRequest, pabyClassThenMode[i], padfCol[i], padfRow[i * nRowStep]);
+            moChooser.Choose(nRequest, pabyClassThenMode[i], panWindow[i] + nWindowShift,
+                             panNearest[i] + nNearestShift);
     }
     // The group of the last pixel holds classes of pixels that don't exist.
     for (int i = nPix; i % kLanes != 0; ++i) {
@@ -360,10 +358,11 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
     oSpan.bOneRow = true;
     oSpan.padfFracRow = &dfFracRow;
     // Rows outside have no samples: no pixel of theirs has a mode that reads any.
-    oSpan.pWindowSrc =
-        bFits ? SrcSample(static_cast<long long>(dfAnchorRow) + moMethod.oWindow.nRowOff, 0)
-              : nullptr;
-    oSpan.pNearestSrc = bNear ? SrcSample(static_cast<long long>(dfNearRow), 0) : nullptr;
+    const long long nWindowRow =
+        bFits ? static_cast<long long>(dfAnchorRow) + moMethod.oWindow.nRowOff : 0;
+    const long long nNearestRow = bNear ? static_cast<long long>(dfNearRow) : 0;
+    oSpan.pWindowSrc = SrcRow(nWindowRow);
+    oSpan.pNearestSrc = SrcRow(nNearestRow);
     alignas(64) unsigned char abyMode[kSpanArray];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
         const std::size_t nCol = static_cast<std::size_t>(nFirstCol) + nDone;
@@ -378,8 +377,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             for (int i = 0; i < oSpan.nPix; ++i) {
                 abyMode[i] = moColumns.vbyClass[nCol + i] & nRowClass;
             }
-            ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vdfPosition.data() + nCol, &dfRow, 0,
-                        abyMode);
+            ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vnWindowCol.data() + nCol,
+                        nWindowRow * moTask.nSrcCols, moColumns.vnNearestCol.data() + nCol,
+                        nNearestRow * moTask.nSrcCols, abyMode);
             oSpan.pabyMode = abyMode;
         }
         oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);

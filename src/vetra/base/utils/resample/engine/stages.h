@@ -31,6 +31,8 @@ struct ClassLimits {
     double dfNearColLast;
     double dfNearRowLast;
     bool bAnchorNearest;  ///< the anchor is the nearest pixel, not the floor
+    double dfColOff;      ///< first column of the window, from the anchor
+    double dfRowOff;
 };
 
 /// Corner positions of a bilinear transform, and its size.
@@ -99,9 +101,11 @@ struct LevelStages {
                                  int nPix, double* padfCol, double* padfRow);
 
     // Modes.
-    /// Class bits of each position.
-    void (*pfnClasses)(const ClassLimits& oLimits, const double* padfCol, const double* padfRow,
-                       int nPix, unsigned char* pabyClass);
+    /// Class bits of each position, and the source pixels at which its window and its nearest pixel
+    /// stand: their indices, with nSrcCols pixels in a row, or 0 where they are outside.
+    void (*pfnClasses)(const ClassLimits& oLimits, int nSrcCols, const double* padfCol,
+                       const double* padfRow, int nPix, unsigned char* pabyClass,
+                       std::int64_t* panWindow, std::int64_t* panNearest);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
     /// of modes (1 << mode).
@@ -112,10 +116,9 @@ struct LevelStages {
     // Places: where the samples of the pixels of one mode start.
     /// Windows: offsets of the first sample and fractions, 0 where the mode isn't 1 (pabyMode may
     /// be null: all are 1).
-    void (*pfnWindows)(bool bAnchorNearest, double dfColOff, double dfRowOff, double dfPitch,
-                       double dfChan, const double* padfCol, const double* padfRow,
-                       const unsigned char* pabyMode, int nPix, std::int64_t* panOffset,
-                       double* padfFracCol, double* padfFracRow);
+    void (*pfnWindows)(const ClassLimits& oLimits, double dfPitch, double dfChan,
+                       const double* padfCol, const double* padfRow, const unsigned char* pabyMode,
+                       int nPix, std::int64_t* panOffset, double* padfFracCol, double* padfFracRow);
     /// Nearest pixels: their offsets, 0 where the mode isn't 2 (pabyMode may be null: all are 2).
     void (*pfnNearestPlaces)(double dfPitch, double dfChan, const double* padfCol,
                              const double* padfRow, const unsigned char* pabyMode, int nPix,

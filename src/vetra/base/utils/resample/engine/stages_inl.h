@@ -57,8 +57,14 @@ void ArrayPositions(const float* pafCol, const float* pafRow, double dfColOff, d
                     int nPix, double* padfCol, double* padfRow) {
     const F64 vColOff = Set1(dfColOff);
     const F64 vRowOff = Set1(dfRowOff);
+    // Beyond the end of a page the processor's own prefetchers don't look.
+    constexpr int kAhead = 1024;
     int i = 0;
     for (; i + kLanes <= nPix; i += kLanes) {
+        if (i % (2 * kLanes) == 0) {
+            __builtin_prefetch(pafCol + i + kAhead);
+            __builtin_prefetch(pafRow + i + kAhead);
+        }
         Store(padfCol + i, LoadFloats(pafCol + i) + vColOff);
         Store(padfRow + i, LoadFloats(pafRow + i) + vRowOff);
     }
@@ -90,42 +96,64 @@ void BilinearPositions(const BilinearCorners& oCorners, std::int64_t nX, std::in
 
 // ---- Modes ----
 
+// floor(x) <= last is x < last + 1 for whole numbers, which saves the floor.
 struct Limits {
     explicit Limits(const ClassLimits& o)
         : fitColFirst(Set1(o.dfFitColFirst)),
-          fitColLast(Set1(o.dfFitColLast)),
+          fitColEnd(Set1(o.dfFitColLast + 1.0)),
           fitRowFirst(Set1(o.dfFitRowFirst)),
-          fitRowLast(Set1(o.dfFitRowLast)),
-          nearColLast(Set1(o.dfNearColLast)),
-          nearRowLast(Set1(o.dfNearRowLast)) {}
+          fitRowEnd(Set1(o.dfFitRowLast + 1.0)),
+          nearColEnd(Set1(o.dfNearColLast + 1.0)),
+          nearRowEnd(Set1(o.dfNearRowLast + 1.0)),
+          anchorShift(Set1(o.bAnchorNearest ? 0.5 : 0.0)) {}
 
-    unsigned Fit(F64 col, F64 row) const {
-        return Bits((fitColFirst <= col) & (col <= fitColLast) & (fitRowFirst <= row) &
-                    (row <= fitRowLast));
+    // Which windows lie inside the source.
+    B64 Fit(F64 col, F64 row) const {
+        const F64 anchorCol = col + anchorShift;
+        const F64 anchorRow = row + anchorShift;
+        return (fitColFirst <= anchorCol) & (anchorCol < fitColEnd) & (fitRowFirst <= anchorRow) &
+               (anchorRow < fitRowEnd);
     }
-    unsigned Near(F64 col, F64 row) const {
+    // Which nearest pixels do.
+    B64 Near(F64 col, F64 row) const {
         const F64 zero = Set1(0.0);
-        return Bits((zero <= col) & (col <= nearColLast) & (zero <= row) & (row <= nearRowLast));
+        const F64 half = Set1(0.5);
+        const F64 nearCol = col + half;
+        const F64 nearRow = row + half;
+        return (zero <= nearCol) & (nearCol < nearColEnd) & (zero <= nearRow) &
+               (nearRow < nearRowEnd);
     }
 
-    F64 fitColFirst, fitColLast, fitRowFirst, fitRowLast, nearColLast, nearRowLast;
+    F64 fitColFirst, fitColEnd, fitRowFirst, fitRowEnd, nearColEnd, nearRowEnd, anchorShift;
 };
 
 inline F64 Nearest(F64 pos) { return Floor(pos + Set1(0.5)); }
 
-inline unsigned FitBits(const Limits& oLimits, bool bAnchorNearest, F64 col, F64 row) {
-    return bAnchorNearest ? oLimits.Fit(Nearest(col), Nearest(row))
-                          : oLimits.Fit(Floor(col), Floor(row));
+// A whole number where lanes say so, else 0.
+inline void StorePlaces(std::int64_t* p, B64 lanes, F64 place) {
+    StoreIntegers(p, Select(lanes, place, Set1(0.0)));
 }
 
-void Classes(const ClassLimits& oClassLimits, const double* padfCol, const double* padfRow,
-             int nPix, unsigned char* pabyClass) {
+// The pixel from which a window's offsets count.
+inline F64 Anchor(const ClassLimits& oLimits, F64 pos) {
+    return oLimits.bAnchorNearest ? Nearest(pos) : Floor(pos);
+}
+
+void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCol,
+             const double* padfRow, int nPix, unsigned char* pabyClass, std::int64_t* panWindow,
+             std::int64_t* panNearest) {
     const Limits oLimits(oClassLimits);
+    const F64 pitch = Set1(nSrcCols);
+    const F64 first = Set1(oClassLimits.dfRowOff * nSrcCols + oClassLimits.dfColOff);
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
-        StoreBits(pabyClass + i, FitBits(oLimits, oClassLimits.bAnchorNearest, col, row),
-                  oLimits.Near(Nearest(col), Nearest(row)));
+        const B64 fit = oLimits.Fit(col, row);
+        const B64 near = oLimits.Near(col, row);
+        StoreBits(pabyClass + i, Bits(fit), Bits(near));
+        StorePlaces(panWindow + i, fit,
+                    Anchor(oClassLimits, row) * pitch + Anchor(oClassLimits, col) + first);
+        StorePlaces(panNearest + i, near, Nearest(row) * pitch + Nearest(col));
     }
 }
 
@@ -139,11 +167,10 @@ unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char 
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
-        const unsigned nFit =
-            bWindow ? FitBits(oLimits, oClassLimits.bAnchorNearest, col, row) : 0u;
+        const unsigned nFit = bWindow ? Bits(oLimits.Fit(col, row)) : 0u;
         unsigned nNear = 0;
         if (nFit != 0xffu && nFallback != 0) {
-            nNear = oLimits.Near(Nearest(col), Nearest(row)) & ~nFit;
+            nNear = Bits(oLimits.Near(col, row)) & ~nFit;
         }
         StoreBits(pabyMode + i, nFit, nNear);
         nFitAny |= nFit;
@@ -155,23 +182,24 @@ unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char 
 
 // ---- Places ----
 
-void Windows(bool bAnchorNearest, double dfColOff, double dfRowOff, double dfPitch, double dfChan,
-             const double* padfCol, const double* padfRow, const unsigned char* pabyMode, int nPix,
+void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan, const double* padfCol,
+             const double* padfRow, const unsigned char* pabyMode, int nPix,
              std::int64_t* panOffset, double* padfFracCol, double* padfFracRow) {
     // Offsets are whole numbers below 2^53, so exact in double.
     const F64 pitch = Set1(dfPitch);
     const F64 chan = Set1(dfChan);
-    const F64 first = Set1(dfRowOff * dfPitch + dfColOff * dfChan);
+    const F64 first = Set1(oLimits.dfRowOff * dfPitch + oLimits.dfColOff * dfChan);
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
-        const F64 anchorCol = bAnchorNearest ? Nearest(col) : Floor(col);
-        const F64 anchorRow = bAnchorNearest ? Nearest(row) : Floor(row);
-        F64 offset = anchorRow * pitch + anchorCol * chan + first;
-        if (pabyMode != nullptr) {
-            offset = Select(BytesEqual(pabyMode + i, 1), offset, Set1(0.0));
+        const F64 anchorCol = Anchor(oLimits, col);
+        const F64 anchorRow = Anchor(oLimits, row);
+        const F64 offset = anchorRow * pitch + anchorCol * chan + first;
+        if (pabyMode == nullptr) {
+            StoreIntegers(panOffset + i, offset);
+        } else {
+            StorePlaces(panOffset + i, BytesEqual(pabyMode + i, 1), offset);
         }
-        StoreIntegers(panOffset + i, offset);
         Store(padfFracCol + i, col - anchorCol);
         Store(padfFracRow + i, row - anchorRow);
     }
@@ -182,11 +210,12 @@ void NearestPlaces(double dfPitch, double dfChan, const double* padfCol, const d
     const F64 pitch = Set1(dfPitch);
     const F64 chan = Set1(dfChan);
     for (int i = 0; i < nPix; i += kLanes) {
-        F64 offset = Nearest(Load(padfRow + i)) * pitch + Nearest(Load(padfCol + i)) * chan;
-        if (pabyMode != nullptr) {
-            offset = Select(BytesEqual(pabyMode + i, 2), offset, Set1(0.0));
+        const F64 offset = Nearest(Load(padfRow + i)) * pitch + Nearest(Load(padfCol + i)) * chan;
+        if (pabyMode == nullptr) {
+            StoreIntegers(panOffset + i, offset);
+        } else {
+            StorePlaces(panOffset + i, BytesEqual(pabyMode + i, 2), offset);
         }
-        StoreIntegers(panOffset + i, offset);
     }
 }
 

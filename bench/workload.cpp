@@ -1,0 +1,108 @@
+#include "workload.h"
+
+#include <cmath>
+#include <cstdint>
+#include <cstring>
+#include <map>
+#include <random>
+
+using namespace vetra::gobs;
+
+std::string Work::Name() const {
+    const char* pszGeometry = eGeometry == Geometry::eRotated ? "rotated"
+                              : eGeometry == Geometry::eDown  ? "scale down"
+                                                              : "scale up";
+    return std::string(pszGeometry) + (bBilinear ? " bilinear" : " nearest") + ", " +
+           DataTypeAdapter::TypeToString(eType) + " x " + std::to_string(nChan) +
+           (bMask ? ", mask" : "") +
+           (nThreads == 0 ? std::string(", all threads") : std::string(", 1 thread"));
+}
+
+double FirstSource(Work::Geometry eGeometry) {
+    return eGeometry == Work::Geometry::eUp ? kSourceSize / 4 : 0;
+}
+
+double ScaleOf(Work::Geometry eGeometry) {
+    return (kSourceSize - 2 * FirstSource(eGeometry)) / kTargetSize;
+}
+
+std::vector<unsigned char>& SourceSamples(const Work& oWork) {
+    static std::map<std::pair<int, int>, std::vector<unsigned char>> oImages;
+    auto& vbySamples = oImages[{oWork.eType, oWork.nChan}];
+    if (vbySamples.empty()) {
+        const std::size_t nBytes = static_cast<std::size_t>(DataTypeAdapter::ByteSize(oWork.eType));
+        const std::size_t nSamples =
+            std::size_t{kSourceSize} * kSourceSize * static_cast<std::size_t>(oWork.nChan);
+        vbySamples.resize(nSamples * nBytes);
+        std::minstd_rand oRandom(1);
+        for (std::size_t i = 0; i < nSamples; ++i) {
+            const auto nValue = static_cast<std::uint16_t>(oRandom() % 200);
+            const auto fValue = static_cast<float>(nValue);
+            std::memcpy(&vbySamples[i * nBytes],
+                        oWork.eType == eDT_32R ? static_cast<const void*>(&fValue) : &nValue,
+                        nBytes);
+        }
+    }
+    return vbySamples;
+}
+
+std::vector<unsigned char>& SourceMask() {
+    static std::vector<unsigned char> vbyMask = [] {
+        std::vector<unsigned char> vby(std::size_t{kSourceSize} * kSourceSize, 1);
+        std::minstd_rand oRandom(2);
+        for (auto& by : vby) {
+            by = oRandom() % 100 != 0;
+        }
+        return vby;
+    }();
+    return vbyMask;
+}
+
+std::vector<unsigned char>& TargetSamples() {
+    static std::vector<unsigned char> vbySamples(static_cast<std::size_t>(kTargetPixels) * 16);
+    return vbySamples;
+}
+
+namespace {
+
+std::vector<float> MakeRotated(double dfFirst, double dfPerCol, double dfPerRow) {
+    std::vector<float> vfPositions(static_cast<std::size_t>(kTargetPixels));
+    for (std::size_t i = 0; i < vfPositions.size(); ++i) {
+        const double x = static_cast<double>(i % kTargetSize);
+        const double y = static_cast<double>(i / kTargetSize);
+        vfPositions[i] = static_cast<float>(dfFirst + x * dfPerCol + y * dfPerRow);
+    }
+    return vfPositions;
+}
+
+const double kdfCos = 0.9 * std::cos(0.17);
+const double kdfSin = 0.9 * std::sin(0.17);
+
+}  // namespace
+
+std::vector<float>& RotatedCols() {
+    static std::vector<float> vfCols = MakeRotated(900.0, kdfCos, -kdfSin);
+    return vfCols;
+}
+std::vector<float>& RotatedRows() {
+    static std::vector<float> vfRows = MakeRotated(100.0, kdfSin, kdfCos);
+    return vfRows;
+}
+
+std::vector<Work> AllWorks() {
+    using Geometry = Work::Geometry;
+    std::vector<Work> voWorks;
+    for (const Geometry eGeometry : {Geometry::eRotated, Geometry::eDown, Geometry::eUp}) {
+        for (const bool bBilinear : {false, true}) {
+            for (const int nChan : {1, 3, 4}) {
+                voWorks.push_back({eGeometry, bBilinear, eDT_8U, nChan, false, 1});
+            }
+            for (const NativeDataTypeCode eType : {eDT_16U, eDT_32R}) {
+                voWorks.push_back({eGeometry, bBilinear, eType, 1, false, 1});
+            }
+            voWorks.push_back({eGeometry, bBilinear, eDT_8U, 1, true, 1});
+            voWorks.push_back({eGeometry, bBilinear, eDT_8U, 1, false, 0});
+        }
+    }
+    return voWorks;
+}

@@ -1,0 +1,56 @@
+#ifndef VETRA_BENCH_WORKLOAD_H
+#define VETRA_BENCH_WORKLOAD_H
+
+#include <functional>
+#include <string>
+#include <vector>
+
+#include "vetra/basic/gobs/raster/datatypeadapter.h"
+
+/// What is measured: a source of 4096 x 4096 pixels sampled at the pixels of a target.
+struct Work {
+    enum class Geometry {
+        eRotated,  ///< position arrays: turned by 0.17 rad, 0.9 source pixels per target pixel
+        eDown,     ///< axis-aligned, 4096 to 3000
+        eUp,       ///< axis-aligned, the inner 2048 to 3000
+    };
+
+    Geometry eGeometry;
+    bool bBilinear;  ///< else nearest
+    vetra::gobs::NativeDataTypeCode eType;
+    int nChan;
+    bool bMask;    ///< one source pixel in a hundred is invalid
+    int nThreads;  ///< 0: all
+
+    std::string Name() const;
+};
+
+constexpr int kSourceSize = 4096;
+constexpr int kTargetSize = 3000;
+constexpr double kTargetPixels = double{kTargetSize} * kTargetSize;
+
+/// First source column and row, and source pixels per target pixel, of an axis-aligned work.
+double FirstSource(Work::Geometry eGeometry);
+double ScaleOf(Work::Geometry eGeometry);
+
+/// Images and positions, made once and shared by all cases.
+std::vector<unsigned char>& SourceSamples(const Work& oWork);
+std::vector<unsigned char>& SourceMask();
+std::vector<unsigned char>& TargetSamples();
+std::vector<float>& RotatedCols();
+std::vector<float>& RotatedRows();
+
+/// All works of the table.
+std::vector<Work> AllWorks();
+
+/// A way of doing a work: the library's name, and the call that is timed. Empty where the library
+/// doesn't offer the work.
+struct Case {
+    std::string sLibrary;
+    std::function<void()> fnRun;
+};
+Case VetraCase(const Work& oWork);
+Case OpenCvCase(const Work& oWork);
+Case GdalCase(const Work& oWork);
+
+#endif  // VETRA_BENCH_WORKLOAD_H
