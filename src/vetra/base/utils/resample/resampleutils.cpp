@@ -1,5 +1,6 @@
 #include "vetra/base/utils/resample/resampleutils.h"
 
+#include <algorithm>
 #include <cmath>
 #include <limits>
 
@@ -32,15 +33,20 @@ unsigned char ChooseMode(unsigned char nRequest, const unsigned char* pabySrcMas
     const auto fnStarts = [](long long nFirst, int nSize, int nWindow) {
         return nFirst >= 0 && nFirst <= static_cast<long long>(nSize) - nWindow;
     };
-    const bool bFits =
+    bool bWhole =
         fnStarts(nCol, nSrcCols, oWindow.nCols) && fnStarts(nRow, nSrcRows, oWindow.nRows);
-    const bool bNear = fnStarts(nNearCol, nSrcCols, 1) && fnStarts(nNearRow, nSrcRows, 1);
-    const engine::ModeChooser oChooser(engine::ModeRule::eWindow, oWindow, pabySrcMask, nSrcCols,
-                                       eFillAction);
-    return oChooser.Choose(nRequest,
-                           static_cast<unsigned char>((bFits ? engine::kClassFits : 0) |
-                                                      (bNear ? engine::kClassNear : 0)),
-                           nRow * nSrcCols + nCol, nNearRow * nSrcCols + nNearCol);
+    bool bUsable = fnStarts(nNearCol, nSrcCols, 1) && fnStarts(nNearRow, nSrcRows, 1);
+    if (pabySrcMask != nullptr) {
+        for (int y = 0; bWhole && y < oWindow.nRows; ++y) {
+            const unsigned char* pabyRow = pabySrcMask + (nRow + y) * nSrcCols + nCol;
+            bWhole = std::find(pabyRow, pabyRow + std::max(oWindow.nCols, 0), 0) ==
+                     pabyRow + std::max(oWindow.nCols, 0);
+        }
+        bUsable = bUsable && pabySrcMask[nNearRow * nSrcCols + nNearCol] == 1;
+    }
+    const engine::ModeTable oModes(engine::ModeRule::eWindow, eFillAction);
+    return oModes.Get(nRequest, static_cast<unsigned char>((bWhole ? engine::kClassFits : 0) |
+                                                           (bUsable ? engine::kClassNear : 0)));
 }
 
 }  // namespace

@@ -110,7 +110,6 @@ class Run {
 
  private:
     void MakeColumnTables();
-    unsigned char OpenMode(unsigned char nClass) const;
 
     void WalkGeneral(long long nBegin, long long nEnd) const;
     void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
@@ -129,7 +128,7 @@ class Run {
     void CopyRuns(const Span& oSpan) const;
     void FillBackground(long long nFirst, int nPix) const;
     template <typename Bits>
-    void Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const;
+    void Deliver(const Span& oSpan, int nChannel, unsigned char* pabySample) const;
 
     const char* SrcRow(long long nRow) const {
         return static_cast<const char*>(moTask.pSrc) + nRow * mnPitch * mnSrcBytes;
@@ -142,7 +141,7 @@ class Run {
     const Method& moMethod;
     const LevelStages& moStages;
     Positions moPositions;
-    ModeChooser moChooser;
+    ModeTable moModes;
     ClassLimits moLimits;
     // Neither mask has a say: modes follow from positions alone.
     bool mbOpen;
@@ -161,8 +160,7 @@ Run::Run(const Task& oTask)
       moMethod(*oTask.poMethod),
       moStages(GetStages(oTask.oOptions.eLevel)),
       moPositions(*oTask.poTfm),
-      moChooser(moMethod.eRule, moMethod.oWindow, oTask.pabySrcMask, oTask.nSrcCols,
-                oTask.eFillAction),
+      moModes(moMethod.eRule, oTask.eFillAction),
       mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
       mnPitch(static_cast<long long>(oTask.nSrcCols) * oTask.nChan),
       mnSrcBytes(kSampleBytes[oTask.nSrcType]),
@@ -172,6 +170,9 @@ Run::Run(const Task& oTask)
     moLimits.dfFitRowFirst = -static_cast<double>(oWindow.nRowOff);
     moLimits.dfFitColLast = static_cast<double>(oTask.nSrcCols) - oWindow.nCols - oWindow.nColOff;
     moLimits.dfFitRowLast = static_cast<double>(oTask.nSrcRows) - oWindow.nRows - oWindow.nRowOff;
+    if (moMethod.papfnValues == nullptr) {
+        moLimits.dfFitColLast = moLimits.dfFitColFirst - 1.0;  // nothing to fit
+    }
     moLimits.dfNearColLast = oTask.nSrcCols - 1.0;
     moLimits.dfNearRowLast = oTask.nSrcRows - 1.0;
     moLimits.bAnchorNearest = oWindow.bAnchorNearest;
@@ -188,14 +189,6 @@ Run::Run(const Task& oTask)
             MakeColumnTables();
         }
     }
-}
-
-// The mode of a pixel of this class where no mask has a say.
-unsigned char Run::OpenMode(unsigned char nClass) const {
-    if (moMethod.papfnValues != nullptr && (nClass & kClassFits) != 0) {
-        return ePO_INTERPOLATED;
-    }
-    return (nClass & kClassNear) != 0 ? mnFallback : static_cast<unsigned char>(ePO_BACKGROUND);
 }
 
 void Run::MakeColumnTables() {
@@ -235,7 +228,7 @@ void Run::MakeColumnTables() {
         auto& vbyMode = moColumns.avbyMode[nRowClass];
         vbyMode.resize(nSize);
         for (std::size_t i = 0; i < nSize; ++i) {
-            vbyMode[i] = OpenMode(moColumns.vbyClass[i] & nRowClass);
+            vbyMode[i] = moModes.Get(ePO_INTERPOLATED, moColumns.vbyClass[i] & nRowClass);
         }
     }
 }
@@ -312,14 +305,21 @@ void Run::Prefetch(const Span& oSpan) const {
 void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
                       long long nWindowShift, const std::int64_t* panNearest,
                       long long nNearestShift, unsigned char* pabyClassThenMode) const {
+    if (moTask.pabySrcMask != nullptr) {
+        const Window& oWindow = moMethod.oWindow;
+        moStages.pfnMaskClasses(
+            {moTask.pabySrcMask + nWindowShift, moTask.pabySrcMask + nNearestShift, moTask.nSrcCols,
+             oWindow.nCols, oWindow.nRows, moMethod.eRule != ModeRule::eNearestSample},
+            panWindow, panNearest, nPix, pabyClassThenMode);
+    }
+    // A copy that no store can reach, so that it needs no reading again.
+    const ModeTable oModes = moModes;
     const unsigned char* pabyRequest =
         moTask.pabyTgtMask == nullptr ? nullptr : moTask.pabyTgtMask + nFirst;
     for (int i = 0; i < nPix; ++i) {
         const unsigned char nRequest =
-            pabyRequest == nullptr ? static_cast<unsigned char>(1) : pabyRequest[i];
-        pabyClassThenMode[i] =
-            moChooser.Choose(nRequest, pabyClassThenMode[i], panWindow[i] + nWindowShift,
-                             panNearest[i] + nNearestShift);
+            pabyRequest == nullptr ? static_cast<unsigned char>(ePO_INTERPOLATED) : pabyRequest[i];
+        pabyClassThenMode[i] = oModes.Get(nRequest, pabyClassThenMode[i]);
     }
     // The group of the last pixel holds classes of pixels that don't exist.
     for (int i = nPix; i % kLanes != 0; ++i) {
@@ -374,7 +374,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
         } else {
-            for (int i = 0; i < oSpan.nPix; ++i) {
+            for (int i = 0; i < kSpanPixels; ++i) {
                 abyMode[i] = moColumns.vbyClass[nCol + i] & nRowClass;
             }
             ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vnWindowCol.data() + nCol,
@@ -441,7 +441,7 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
 
 // Writes one channel of a span: samples, background, or nothing, as each pixel's mode says.
 template <typename Bits>
-void Run::Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const {
+void Run::Deliver(const Span& oSpan, int nChannel, unsigned char* pabySample) const {
     const int nChan = moTask.nChan;
     char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::ptrdiff_t>(nChannel) * sizeof(Bits);
     const auto fnWrite = [&](int i, const void* pSample) {
@@ -449,20 +449,30 @@ void Run::Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySamp
                     sizeof(Bits));
     };
     const auto fnSample = [&](int i) { return pabySample + i * sizeof(Bits); };
-    if ((oSpan.nModes & (kSetBackground | kSetUntouched)) == 0) {
-        if (nChan == 1) {
-            std::memcpy(pTgt, pabySample, oSpan.nPix * sizeof(Bits));
-            return;
-        }
+    if ((oSpan.nModes & kSetUntouched) != 0) {
         for (int i = 0; i < oSpan.nPix; ++i) {
-            fnWrite(i, fnSample(i));
+            if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
+                fnWrite(i, oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground : fnSample(i));
+            }
         }
         return;
     }
-    for (int i = 0; i < oSpan.nPix; ++i) {
-        if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
-            fnWrite(i, oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground : fnSample(i));
+    if ((oSpan.nModes & kSetBackground) != 0) {
+        Bits background;
+        std::memcpy(&background, moTask.pBackground, sizeof(Bits));
+        for (int i = 0; i < oSpan.nPix; ++i) {
+            Bits sample;
+            std::memcpy(&sample, fnSample(i), sizeof(Bits));
+            sample = oSpan.pabyMode[i] == ePO_BACKGROUND ? background : sample;
+            std::memcpy(fnSample(i), &sample, sizeof(Bits));
         }
+    }
+    if (nChan == 1) {
+        std::memcpy(pTgt, pabySample, static_cast<std::size_t>(oSpan.nPix) * sizeof(Bits));
+        return;
+    }
+    for (int i = 0; i < oSpan.nPix; ++i) {
+        fnWrite(i, fnSample(i));
     }
 }
 

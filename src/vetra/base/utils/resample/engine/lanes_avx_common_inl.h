@@ -208,3 +208,13 @@ inline void StoreSamples(T* p, F64 a) {
         }
     }
 }
+
+inline unsigned ByteBits(const unsigned char* p, const std::int64_t* o, unsigned char nValue) {
+    const __m128i vSame = _mm_cmpeq_epi8(Gather8(p, o), _mm_set1_epi8(static_cast<char>(nValue)));
+    return static_cast<unsigned>(_mm_movemask_epi8(vSame)) & 0xffu;
+}
+inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* o) {
+    const __m128i vZero = _mm_setzero_si128();
+    const __m128i vFull = _mm_cmpeq_epi16(_mm_cmpeq_epi8(Gather16<1>(p, o), vZero), vZero);
+    return static_cast<unsigned>(_mm_movemask_epi8(_mm_packs_epi16(vFull, vFull))) & 0xffu;
+}

@@ -147,3 +147,15 @@ inline void StoreSamples(T* p, F64 a) {
         p[i] = static_cast<T>(a.v[i / 2][i % 2]);
     }
 }
+
+inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
+                         unsigned char nValue) {
+    unsigned nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        nBits |= static_cast<unsigned>(p[panOffset[i]] == nValue) << i;
+    }
+    return nBits;
+}
+inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* panOffset) {
+    return ~(ByteBits(p, panOffset, 0) | ByteBits(p + 1, panOffset, 0)) & 0xffu;
+}

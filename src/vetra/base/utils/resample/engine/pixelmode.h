@@ -22,67 +22,51 @@ struct Window {
     bool bAnchorNearest = true;
 };
 
-/// Decides the modes of pixels from what is known of their positions, requests and source masks
-/// included.
-class ModeChooser {
+/// What becomes of a pixel, by its request and by what its position and the source mask allow: the
+/// window bit of a class says that the window is whole, the nearest bit that the nearest sample may
+/// be used.
+class ModeTable {
  public:
-    ModeChooser(ModeRule eRule, const Window& oWindow, const unsigned char* pabySrcMask,
-                int nSrcCols, NodataFillAction eFillAction)
-        : meRule(eRule),
-          moWindow(oWindow),
-          mpabySrcMask(pabySrcMask),
-          mnSrcCols(nSrcCols),
-          meFillAction(eFillAction) {}
+    ModeTable(ModeRule eRule, NodataFillAction eFillAction) {
+        for (unsigned char nRequest = 0; nRequest < kRequests; ++nRequest) {
+            for (unsigned char nClass = 0; nClass < kClasses; ++nClass) {
+                mabyMode[nRequest * kClasses + nClass] =
+                    Choose(eRule, eFillAction, nRequest, nClass);
+            }
+        }
+    }
 
-    /// The mode of a pixel.
-    /// \param nRequest  the target mask's byte
-    /// \param nClass    class bits of the position
-    /// \param nWindow   index of the source pixel at which the window starts, if it fits
-    /// \param nNearest  index of the nearest source pixel, if that is inside
-    unsigned char Choose(unsigned char nRequest, unsigned char nClass, long long nWindow,
-                         long long nNearest) const {
+    unsigned char Get(unsigned char nRequest, unsigned char nClass) const {
+        // Requests above 3 are all the same.
+        const int nRow = nRequest < kRequests ? nRequest : kRequests - 1;
+        return mabyMode[nRow * kClasses + nClass];
+    }
+
+ private:
+    static constexpr int kRequests = 5;
+    static constexpr int kClasses = 4;
+
+    static unsigned char Choose(ModeRule eRule, NodataFillAction eFillAction,
+                                unsigned char nRequest, unsigned char nClass) {
+        const bool bWhole = (nClass & kClassFits) != 0;
+        const bool bUsable = (nClass & kClassNear) != 0;
         if (nRequest == ePO_BACKGROUND || nRequest == ePO_UNTOUCHED) {
             return nRequest;
         }
-        const bool bInside = (nClass & kClassNear) != 0;
-        if (meRule == ModeRule::eNearestSample) {
-            if (!bInside || MaskByte(nNearest) == 0) {
+        if (eRule == ModeRule::eNearestSample) {
+            if (!bUsable) {
                 return ePO_BACKGROUND;
             }
             return nRequest <= ePO_NEAREST ? ePO_NEAREST : ePO_UNTOUCHED;
         }
-        if (nRequest != ePO_NEAREST && (nClass & kClassFits) != 0 && WindowIsValid(nWindow)) {
+        if (nRequest != ePO_NEAREST && bWhole) {
             return ePO_INTERPOLATED;
         }
-        const bool bFill = nRequest == ePO_NEAREST || meFillAction != eNFA_BGD;
-        return bFill && bInside && MaskByte(nNearest) == 1 ? ePO_NEAREST : ePO_BACKGROUND;
+        const bool bFill = nRequest == ePO_NEAREST || eFillAction != eNFA_BGD;
+        return bFill && bUsable ? ePO_NEAREST : ePO_BACKGROUND;
     }
 
- private:
-    unsigned char MaskByte(long long nPixel) const {
-        return mpabySrcMask == nullptr ? static_cast<unsigned char>(1) : mpabySrcMask[nPixel];
-    }
-
-    bool WindowIsValid(long long nWindow) const {
-        if (mpabySrcMask == nullptr) {
-            return true;
-        }
-        const unsigned char* pabyRow = mpabySrcMask + nWindow;
-        for (int nRow = 0; nRow < moWindow.nRows; ++nRow, pabyRow += mnSrcCols) {
-            for (int nCol = 0; nCol < moWindow.nCols; ++nCol) {
-                if (pabyRow[nCol] == 0) {
-                    return false;
-                }
-            }
-        }
-        return true;
-    }
-
-    ModeRule meRule;
-    Window moWindow;
-    const unsigned char* mpabySrcMask;
-    int mnSrcCols;
-    NodataFillAction meFillAction;
+    unsigned char mabyMode[kRequests * kClasses];
 };
 
 }  // namespace vetra::utils::engine

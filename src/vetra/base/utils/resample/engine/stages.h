@@ -35,6 +35,16 @@ struct ClassLimits {
     double dfRowOff;
 };
 
+/// The source mask, as a run's windows see it.
+struct MaskWindow {
+    const unsigned char* pabyWindow;
+    const unsigned char* pabyNearest;
+    int nSrcCols;
+    int nWndCols;
+    int nWndRows;
+    bool bExactlyOne;
+};
+
 /// Corner positions of a bilinear transform, and its size.
 struct BilinearCorners {
     double adfCol[4];
@@ -106,6 +116,11 @@ struct LevelStages {
     void (*pfnClasses)(const ClassLimits& oLimits, int nSrcCols, const double* padfCol,
                        const double* padfRow, int nPix, unsigned char* pabyClass,
                        std::int64_t* panWindow, std::int64_t* panNearest);
+    /// Takes masked pixels out of the classes: the window bit where the window holds a mask byte of
+    /// 0, the nearest bit where that pixel's byte is 0 (bExactlyOne: is not 1). The masks are
+    /// those of the window and of the nearest pixel to which an index of 0 leads.
+    void (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                           const std::int64_t* panNearest, int nPix, unsigned char* pabyClass);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
     /// of modes (1 << mode).

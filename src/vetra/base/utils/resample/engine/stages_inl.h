@@ -12,6 +12,8 @@
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Abs          RoundEven: to nearest, ties to even
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
+//   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
+//                                neither of two adjacent bytes is 0
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
 //   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
@@ -157,6 +159,37 @@ void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCo
     }
 }
 
+void MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                 const std::int64_t* panNearest, int nPix, unsigned char* pabyClass) {
+    for (int i = 0; i < nPix; i += kLanes) {
+        unsigned char* pabyGroup = pabyClass + i;
+        // Where nothing fits the source may be smaller than a window.
+        unsigned nFull = 0;
+        if (AnyByteEquals(pabyGroup, kClassFits) ||
+            AnyByteEquals(pabyGroup, kClassFits | kClassNear)) {
+            nFull = 0xff;
+            const unsigned char* pabyRow = oWindow.pabyWindow;
+            for (int nRow = 0; nRow < oWindow.nWndRows; ++nRow, pabyRow += oWindow.nSrcCols) {
+                int nCol = 0;
+                for (; nCol + 1 < oWindow.nWndCols; nCol += 2) {
+                    nFull &= FullPairBits(pabyRow + nCol, panWindow + i);
+                }
+                if (nCol < oWindow.nWndCols) {
+                    nFull &= ~ByteBits(pabyRow + nCol, panWindow + i, 0);
+                }
+            }
+        }
+        const unsigned nUsable = oWindow.bExactlyOne
+                                     ? ByteBits(oWindow.pabyNearest, panNearest + i, 1)
+                                     : ~ByteBits(oWindow.pabyNearest, panNearest + i, 0);
+        unsigned char abyKeep[kLanes];
+        StoreBits(abyKeep, nFull & 0xffu, nUsable & 0xffu);
+        for (int k = 0; k < kLanes; ++k) {
+            pabyGroup[k] &= abyKeep[k];
+        }
+    }
+}
+
 unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char nFallback,
                    const double* padfCol, const double* padfRow, int nPix,
                    unsigned char* pabyMode) {
@@ -287,9 +320,10 @@ void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsign
         }
         return;
     }
-    for (int i = 0; i < nPix; ++i) {
-        if (pabyMode[i] == 2) {
-            padfValue[i] = static_cast<double>(p[panOffset[i]]);
+    for (int i = 0; i < nPix; i += kLanes) {
+        if (AnyByteEquals(pabyMode + i, 2)) {
+            const F64 nearest = Gather(p, panOffset + i);
+            Store(padfValue + i, Select(BytesEqual(pabyMode + i, 2), nearest, Load(padfValue + i)));
         }
     }
 }
@@ -438,6 +472,7 @@ const LevelStages kStages = {
     &ArrayPositions,
     &BilinearPositions,
     &Classes,
+    &MaskClasses,
     &OpenModes,
     &Windows,
     &NearestPlaces,
