@@ -11,6 +11,7 @@
 #include <limits>
 #include <memory>
 #include <random>
+#include <typeinfo>
 #include <vector>
 
 #include "reference.h"
@@ -89,7 +90,8 @@ void FillSamples(Random& oRandom, NativeDataTypeCode eType, unsigned char* pabyB
             double df = oRandom.Real(-300, 300);
             if (nKind == 1) df = std::ldexp(df, oRandom.Int(-80, 80));
             if (nKind == 2 && oRandom.Chance(0.1)) {
-                df = oRandom.Pick<double>({NAN, INFINITY, -INFINITY, -0.0, 0.25, -9999.0, 3e38, -3e38});
+                df = oRandom.Pick<double>(
+                    {NAN, INFINITY, -INFINITY, -0.0, 0.25, -9999.0, 3e38, -3e38});
             }
             const float f = static_cast<float>(df);
             std::memcpy(&nBits, eType == eDT_32R ? static_cast<const void*>(&f) : &df,
@@ -162,7 +164,8 @@ std::unique_ptr<IBufPosTfm> MakeTransform(Random& oRandom, int nCols, int nRows,
                 pafCol[i] = static_cast<float>(oRandom.Real(-2, dfWide) - nOff);
                 pafRow[i] = static_cast<float>(oRandom.Real(-2, dfHigh));
                 if (oRandom.Chance(0.2)) pafCol[i] = std::round(2 * pafCol[i]) / 2;
-                if (oRandom.Chance(0.02)) pafRow[i] = oRandom.Pick<float>({NAN, INFINITY, -3e38f, 3e9f});
+                if (oRandom.Chance(0.02))
+                    pafRow[i] = oRandom.Pick<float>({NAN, INFINITY, -3e38f, 3e9f});
             }
             return std::make_unique<BufPosArrayTfm>(nCols, nRows, pafCol.release(), nOff,
                                                     pafRow.release(), 0, true);
@@ -186,6 +189,8 @@ std::unique_ptr<IBufPosTfm> MakeTransform(Random& oRandom, int nCols, int nRows,
             return std::make_unique<OddTfm>(nCols, nRows, oRandom.Pick({0.2, 1.0}));
     }
 }
+
+const char* TransformName(const IBufPosTfm& oTfm) { return typeid(oTfm).name(); }
 
 ResampleInfo MakeInfo(Random& oRandom, ResampleMethod eMethod) {
     ResampleInfo oInfo;
@@ -302,7 +307,7 @@ void CompareRandomRun(Random& oRandom, const TypePair& oPair, ResampleMethod eMe
             const int nThreads = oRandom.Pick({1, 2, 3, 7});
             SCOPED_TRACE(testing::Message()
                          << engine::GetStages(eLevel).pszName << " shortcuts " << bShortcuts
-                         << " threads " << nThreads << " transform " << typeid(*poTfm).name()
+                         << " threads " << nThreads << " transform " << TransformName(*poTfm)
                          << " source " << nSrcCols << "x" << nSrcRows << " target " << nTgtCols
                          << "x" << nTgtRows << " channels " << nChan);
             omp_set_num_threads(nThreads);
@@ -384,7 +389,7 @@ TEST_P(Exactness, BlocksGiveTheBytesOfOneRun) {
     vpoTfms.push_back(std::make_unique<OddTfm>(nCols, nRows, 1.0));
 
     for (const auto& poTfm : vpoTfms) {
-        SCOPED_TRACE(typeid(*poTfm).name());
+        SCOPED_TRACE(TransformName(*poTfm));
         ResampleBuffer oWhole(eDT_16U, nCols, nRows, 2);
         poResampler->Resample(oSrc.oBuffer, oWhole, *poTfm);
         for (const int nSize : {64, 100, 1000}) {

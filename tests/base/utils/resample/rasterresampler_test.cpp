@@ -1,0 +1,154 @@
+#include <gtest/gtest.h>
+
+#include <limits>
+#include <memory>
+#include <vector>
+
+#include "tests/support/refusal.h"
+#include "vetra/vetra.h"
+
+namespace vetra::utils {
+namespace {
+
+using tests::ExpectRefusal;
+
+constexpr double kLowest = std::numeric_limits<double>::lowest();
+constexpr double kHighest = std::numeric_limits<double>::max();
+
+// Column and row offset, window, anchors; then left, top, right and bottom margin.
+using Geometry = std::vector<int>;
+Geometry GetGeometry(const IRasterResampler& oResampler) {
+    Geometry an(10);
+    WindowAnchorPoint eCol, eRow;
+    oResampler.GetWindowExtents(an[0], an[1], an[2], an[3], eCol, eRow);
+    an[4] = eCol;
+    an[5] = eRow;
+    oResampler.GetSrcBufferMargins(an[6], an[7], an[8], an[9]);
+    return an;
+}
+
+// Clamp range, background, its flag, fill action.
+using Settings = std::vector<double>;
+Settings GetSettings(const IRasterResampler& oResampler) {
+    Settings adf(5);
+    oResampler.GetClampRange(adf[0], adf[1]);
+    adf[2] = oResampler.GetOutBgd();
+    adf[3] = oResampler.GetClampBgdFlag();
+    adf[4] = oResampler.GetNodataFillAction();
+    return adf;
+}
+
+template <typename R, typename... Args>
+void CheckClass(int nMethod, const Geometry& anGeometry, const CoefficientMap& oCoefficients,
+                Args... args) {
+    SCOPED_TRACE(nMethod);
+    R oResampler(args...);
+    EXPECT_EQ(oResampler.GetResampleType(), nMethod);
+    EXPECT_EQ(GetGeometry(oResampler), anGeometry);
+    EXPECT_EQ(oResampler.GetCoefficients(), oCoefficients);
+    EXPECT_EQ(GetSettings(oResampler), (Settings{kLowest, kHighest, kLowest, 1, 0}));
+
+    // A clone takes the settings of the moment, and setters on one don't reach the other.
+    oResampler.SetClampRange(1.0, 2.0);
+    oResampler.SetOutBgd(3.0);
+    oResampler.SetClampBgdFlag(false);
+    oResampler.SetNodataFillAction(eNFA_BGD);
+    const std::unique_ptr<R> poClone(oResampler.Clone());
+    EXPECT_TRUE(poClone->GetResampleInfo() == oResampler.GetResampleInfo());
+    EXPECT_EQ(GetGeometry(*poClone), anGeometry);
+    poClone->SetOutBgd(5.0);
+    oResampler.SetClampRange(-1.0, 4.0);
+    ExpectRefusal(
+        {"dfClampMin & dfClampMax", 1, "dfClampMin = 2.000000 dfClampMax = 1.000000",
+         "dfClampMin <= dfClampMax", "Min clamp range cannot be greater than max clamp range"},
+        [&] { oResampler.SetClampRange(2.0, 1.0); });
+    EXPECT_EQ(GetSettings(*poClone), (Settings{1, 2, 5, 0, 1}));
+    EXPECT_EQ(GetSettings(oResampler), (Settings{-1, 4, 3, 0, 1}));
+}
+
+TEST(RasterResampler, AllClasses) {
+    const Geometry kOne = {0, 0, 1, 1, 1, 1, 0, 0, 1, 1};
+    const Geometry kTwo = {0, 0, 2, 2, 0, 0, 0, 0, 1, 1};
+    const Geometry kFour = {-1, -1, 4, 4, 0, 0, -1, -1, 2, 2};
+    const Geometry kEight = {-3, -3, 8, 8, 0, 0, -3, -3, 4, 4};
+    const Geometry kThreeFive = {0, 0, 3, 5, 1, 1, 0, 0, 3, 5};
+    const CoefficientMap oWindow = {{"NUMCOLS", "3"}, {"NUMROWS", "5"}};
+    CheckClass<BilinearResampler>(0, kTwo, {});
+    CheckClass<CubicResampler>(1, kFour, {});
+    CheckClass<CubicPsResampler>(2, kFour, {});
+    CheckClass<NearestResampler>(3, kOne, {});
+    CheckClass<AverageResampler>(6, kThreeFive, oWindow, 3, 5);
+    CheckClass<MedianResampler>(7, kThreeFive, oWindow, 3, 5);
+    CheckClass<Lagrange4Resampler>(9, kFour, {});
+    CheckClass<Lagrange8Resampler>(10, kEight, {});
+    CheckClass<SqBilinearResampler>(13, kTwo, {});
+    CheckClass<SqCubicResampler>(14, kFour, {});
+    CheckClass<SqCubicPsResampler>(15, kFour, {});
+    CheckClass<SqNearestResampler>(16, kOne, {});
+    CheckClass<SqAverageResampler>(19, kThreeFive, oWindow, 3, 5);
+    CheckClass<SqMedianResampler>(20, kThreeFive, oWindow, 3, 5);
+    CheckClass<SqLagrange4Resampler>(21, kFour, {});
+    CheckClass<SqLagrange8Resampler>(22, kEight, {});
+}
+
+template <typename R>
+void CheckWindowSizes(const char* pszMethod, int nTooLarge, const char* pszLimit) {
+    R(1, 1);
+    R(11, 11);
+    for (const int nSize : {0, -3, nTooLarge}) {
+        const std::string sRest = std::string(pszMethod) + " must be a positive number" + pszLimit;
+        const std::string sSize = std::to_string(nSize);
+        ExpectRefusal({"nWndNumCols", 1, sSize, "Positive number", "Num cols for " + sRest},
+                      [&] { R(nSize, nSize); });
+        ExpectRefusal({"nWndNumRows", 1, sSize, "Positive number", "Num rows for " + sRest},
+                      [&] { R(3, nSize); });
+    }
+}
+
+TEST(RasterResampler, WindowSizes) {
+    CheckWindowSizes<AverageResampler>("averaging", 0, "");
+    CheckWindowSizes<SqAverageResampler>("averaging", 0, "");
+    CheckWindowSizes<MedianResampler>("median", 0, "");
+    CheckWindowSizes<SqMedianResampler>("median", 12, ", max 11");
+    MedianResampler(12, 3);
+}
+
+// A caller's own class, whose axes have different anchors.
+class OwnResampler : public IRasterResampler {
+ public:
+    OwnResampler() = default;
+    OwnResampler* Clone() const override { return new OwnResampler(*this); }
+    void Set(WindowAnchorPoint eCol, WindowAnchorPoint eRow) {
+        ResampleInfo oInfo;
+        oInfo.mvdfKernelWeights = {0.5};
+        SetResampleInfo(oInfo);
+        SetWindowExtents(-2, -5, 6, 4, eCol, eRow);
+    }
+};
+
+TEST(RasterResampler, OwnClass) {
+    OwnResampler oOwn;
+    EXPECT_EQ(GetGeometry(oOwn), (Geometry{0, 0, 1, 1, 1, 1, 0, 0, 1, 1}));
+    oOwn.Set(eWAP_FLOOR, eWAP_NEAREST);
+    EXPECT_EQ(GetGeometry(oOwn), (Geometry{-2, -5, 6, 4, 0, 1, -2, -5, 3, -1}));
+    oOwn.Set(eWAP_NEAREST, eWAP_FLOOR);
+    const std::unique_ptr<OwnResampler> poClone(oOwn.Clone());
+    EXPECT_EQ(GetGeometry(*poClone), (Geometry{-2, -5, 6, 4, 1, 0, -2, -5, 4, -2}));
+    EXPECT_EQ(poClone->GetResampleInfo().mvdfKernelWeights, std::vector<double>{0.5});
+}
+
+TEST(RasterResampler, SettingsReachTheRun) {
+    unsigned char abySrc[] = {10, 20, 30};
+    unsigned char abyTgt[4] = {};
+    const ResampleBuffer oSrc(gobs::eDT_8U, 3, 1, 1, abySrc, nullptr, false);
+    ResampleBuffer oTgt(gobs::eDT_8U, 4, 1, 1, abyTgt, nullptr, false);
+    NearestResampler oResampler;
+    oResampler.SetClampRange(15.0, 25.0);
+    oResampler.SetOutBgd(20.0);
+    oResampler.Resample(oSrc, oTgt, BufPosScaleOffTfm(4, 1, 1.0, 0.0, 1.0, 0.0, 0, 0));
+    EXPECT_EQ(std::vector<unsigned char>(abyTgt, abyTgt + 4),
+              (std::vector<unsigned char>{15, 21, 25, 20}));
+}
+
+}  // namespace
+}  // namespace vetra::utils

@@ -1,0 +1,78 @@
+#include <vetra/vetra.h>
+
+#include <cstdio>
+#include <memory>
+
+using namespace vetra::utils;
+
+namespace {
+
+int gnFailures = 0;
+
+void Check(bool bOk, const char* pszWhat) {
+    if (!bOk) {
+        std::printf("failed: %s\n", pszWhat);
+        ++gnFailures;
+    }
+}
+
+// Deriving and throwing both cross the library's boundary.
+class ShiftTfm : public BufPosScaleOffTfm {
+ public:
+    ShiftTfm() : BufPosScaleOffTfm(3, 1, 1.0, 0.0, 1.0, 0.0, 0, 0) {}
+    void GetSrcPos(long long nIdx, double& dfCol, double& dfRow) const override {
+        BufPosScaleOffTfm::GetSrcPos(nIdx, dfCol, dfRow);
+        dfCol += 1.0;
+    }
+};
+
+}  // namespace
+
+int main() {
+    unsigned char abySrc[] = {10, 20, 30};
+    float afTgt[3] = {};
+    const ResampleBuffer oSrc(vetra::gobs::eDT_8U, 3, 1, 1, abySrc, nullptr, false);
+    ResampleBuffer oTgt(vetra::gobs::eDT_32R, 3, 1, 1, reinterpret_cast<unsigned char*>(afTgt),
+                        nullptr, false);
+    NearestResampler oNearest;
+    oNearest.SetOutBgd(-1.0);
+    oNearest.Resample(oSrc, oTgt, ShiftTfm());
+    Check(afTgt[0] == 20.0f && afTgt[1] == 30.0f && afTgt[2] == -1.0f, "resampled samples");
+
+    bool bCaught = false;
+    try {
+        ResampleBuffer oRefused(vetra::gobs::eDT_UNKNOWN, 1, 1, 1);
+    } catch (const vetra::DataException& oCaught) {
+        bCaught = dynamic_cast<const vetra::ParameterException*>(&oCaught) != nullptr;
+    }
+    Check(bCaught, "exception across the library's boundary");
+
+    // What else a consumer links.
+    float afPos[] = {0.0f};
+    const BufPosArrayTfm oArray(1, 1, afPos, 0, afPos, 0, false);
+    const BufPosBilinearTfm oBilinear(1, 1, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0);
+    const std::unique_ptr<IRasterResampler> apoResamplers[] = {
+        std::make_unique<BilinearResampler>(),    std::make_unique<SqBilinearResampler>(),
+        std::make_unique<CubicResampler>(),       std::make_unique<SqCubicResampler>(),
+        std::make_unique<CubicPsResampler>(),     std::make_unique<SqCubicPsResampler>(),
+        std::make_unique<Lagrange4Resampler>(),   std::make_unique<SqLagrange4Resampler>(),
+        std::make_unique<Lagrange8Resampler>(),   std::make_unique<SqLagrange8Resampler>(),
+        std::make_unique<AverageResampler>(1, 1), std::make_unique<SqAverageResampler>(1, 1),
+        std::make_unique<MedianResampler>(1, 1),  std::make_unique<SqMedianResampler>(1, 1),
+        std::make_unique<SqNearestResampler>()};
+    for (const auto& poResampler : apoResamplers) {
+        Check(BlockPlanner(oArray, 3, 1, *poResampler, 1, 1).GetNumBlocks() == 1, "blocks");
+    }
+    float fClamped = 0.0f;
+    std::unique_ptr<PixelClamp<float>>(PixelClampFactory::Create<float>(0.0, 1.0, 0.5, true))
+        ->Clamp(7.0, &fClamped);
+    Check(fClamped == 1.0f && SaturateCast<short>(1e9) == 32767, "clamp");
+    Check(ChooseResampleMode(1, nullptr, 3, 1, 0.0, 0.0, 0, 0, 1, 1, eNFA_NN) == 1 &&
+              ChooseResampleModeForFilter(1, nullptr, 3, 1, 5.0, 0.0, 0, 0, 1, 1, eNFA_NN) == 0,
+          "modes");
+    Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
+    Check(FormatString("%d.%d.%d", VETRA_VERSION_MAJOR, VETRA_VERSION_MINOR, VETRA_VERSION_PATCH) ==
+              VETRA_VERSION,
+          "version");
+    return gnFailures;
+}
