@@ -30,7 +30,7 @@ Exception::Exception(Parts oParts) {
     AppendPart(sWhat, "; ", "file: ", oParts.sFileName);
     AppendPart(sWhat, " ", "in ", oParts.sFunction);
     std::string sPosition = oParts.sFile;
-    if (oParts.nLine != 0) {
+    if (!sPosition.empty() && oParts.nLine != 0) {
         sPosition += ':' + std::to_string(oParts.nLine);
     }
     AppendPart(sWhat, " ", "at ", sPosition);

@@ -34,9 +34,14 @@ namespace vetra {
 /// An exception keeps every text that it was given. Copying one shares the texts and never throws.
 /// The accessors of parts that a class doesn't take give an empty text.
 class VETRA_EXPORT Exception : public std::exception {
-   public:
+ public:
     Exception(const std::string& sMessage, const std::string& sFile, const std::string& sFunction,
               std::uint32_t nLine);
+
+    // Copies only: a moved-from exception still has its texts.
+    Exception(const Exception&) noexcept = default;
+    Exception& operator=(const Exception&) noexcept = default;
+    ~Exception() override = default;
 
     /// One readable text with every part that is not empty: message, argument name, got, expected,
     /// file name, then function and source position.
@@ -51,7 +56,7 @@ class VETRA_EXPORT Exception : public std::exception {
     /// Line in `GetFile`; 0 when the failure carries no location.
     std::uint32_t GetLine() const noexcept;
 
-   protected:
+ protected:
     struct Parts {
         std::string sMessage;
         std::string sArgument;
@@ -68,18 +73,18 @@ class VETRA_EXPORT Exception : public std::exception {
     explicit Exception(Parts oParts);
     const Parts& GetParts() const noexcept { return *mpoParts; }
 
-   private:
+ private:
     std::shared_ptr<const Parts> mpoParts;
 };
 
 class VETRA_EXPORT DataException : public Exception {
-   public:
+ public:
     using Exception::Exception;
 };
 
 /// An argument, or a value that stands for one, can't be used.
 class VETRA_EXPORT ParameterException : public DataException {
-   public:
+ public:
     /// Why the argument was refused.
     enum Type : int {
         eInvalid = 1,      ///< not one of the values that can be used
@@ -89,8 +94,7 @@ class VETRA_EXPORT ParameterException : public DataException {
 
     ParameterException(const std::string& sArgument, Type eType, const std::string& sGot,
                        const std::string& sExpected, const std::string& sMessage,
-                       const std::string& sFile, const std::string& sFunction,
-                       std::uint32_t nLine);
+                       const std::string& sFile, const std::string& sFunction, std::uint32_t nLine);
 
     const std::string& GetArgument() const noexcept;
     Type GetType() const noexcept;
@@ -99,7 +103,7 @@ class VETRA_EXPORT ParameterException : public DataException {
 };
 
 class VETRA_EXPORT DataTypeException : public DataException {
-   public:
+ public:
     DataTypeException(const std::string& sGot, const std::string& sExpected,
                       const std::string& sMessage, const std::string& sFile,
                       const std::string& sFunction, std::uint32_t nLine);
@@ -109,7 +113,7 @@ class VETRA_EXPORT DataTypeException : public DataException {
 };
 
 class VETRA_EXPORT FormatException : public DataException {
-   public:
+ public:
     FormatException(const std::string& sGot, const std::string& sMessage,
                     const std::string& sExpected, const std::string& sFile,
                     const std::string& sFunction, std::uint32_t nLine);
@@ -119,27 +123,27 @@ class VETRA_EXPORT FormatException : public DataException {
 };
 
 class VETRA_EXPORT IOException : public Exception {
-   protected:
+ protected:
     using Exception::Exception;
 };
 
 class VETRA_EXPORT DeviceException : public IOException {
-   public:
+ public:
     DeviceException(const std::string& sMessage, const std::string& sFile,
                     const std::string& sFunction, std::uint32_t nLine);
 };
 
 class VETRA_EXPORT FileException : public IOException {
-   public:
+ public:
     /// The file or directory that the operation was about.
     const std::string& GetFileName() const noexcept;
 
-   protected:
+ protected:
     using IOException::IOException;
 };
 
 class VETRA_EXPORT FileAccessException : public FileException {
-   public:
+ public:
     /// What could not be done with the file.
     enum Type : int {
         eCannotRead = 1,    ///< opening or reading
@@ -154,7 +158,7 @@ class VETRA_EXPORT FileAccessException : public FileException {
 };
 
 class VETRA_EXPORT FileNotFoundException : public FileException {
-   public:
+ public:
     FileNotFoundException(const std::string& sFileName, const std::string& sMessage,
                           const std::string& sFile, const std::string& sFunction,
                           std::uint32_t nLine);

@@ -35,9 +35,10 @@ class VETRA_EXPORT BlockPlanner {
     BlockPlanner(const IBufPosTfm& oTfm, int nSrcCols, int nSrcRows,
                  const IRasterResampler& oResampler, int nBlockCols, int nBlockRows);
 
-    /// Chooses the largest blocks that need no more than \p nMaxBytes for source and target pixels
-    /// together: whole rows if that is possible, with a power of two as size where the target is
-    /// cut. Where even a single pixel needs more, blocks are single pixels.
+    /// Chooses blocks that need no more than \p nMaxBytes for source and target pixels together: as
+    /// many whole rows as possible, or, where 64 whole rows need more, narrower blocks. The size is
+    /// a power of two where the target is cut. Where even a single pixel needs more, blocks are
+    /// single pixels.
     ///
     /// \param nSrcPixelBytes  bytes that the caller keeps per source pixel, masks included
     /// \param nTgtPixelBytes  bytes per target pixel

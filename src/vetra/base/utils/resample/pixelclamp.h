@@ -15,8 +15,8 @@ VETRA_EXPORT T SaturateCast(double dfValue);
 /// Turns computed doubles into samples of type T: limits, rounding, and on request a background
 /// value that no computed sample may take.
 ///
-/// T is one of the ten sample types: `signed char` to `unsigned long long` (`std::int64_t` and
-/// `std::uint64_t` for 64 bits), `float`, `double`.
+/// T is one of the ten sample types: `signed char`, `short`, `int`, `std::int64_t`, their unsigned
+/// forms, `float`, `double`.
 ///
 /// The limits and the background are saturated to T and, for an integer T, cut toward zero. Limits
 /// in the wrong order are exchanged. With a background, a limit equal to it moves one step (1, or

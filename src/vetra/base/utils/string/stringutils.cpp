@@ -60,7 +60,10 @@ bool IsNumeric(const std::string& s) {
 double TextToDouble(const std::string& s) {
     static const locale_t kCLocale = newlocale(LC_ALL_MASK, "C", nullptr);
     std::string sText = s;
-    std::replace_if(
-        sText.begin(), sText.end(), [](char c) { return c == 'D' || c == 'd'; }, 'E');
+    const std::size_t nMarker = sText.find_first_of("Dd");
+    if (nMarker != std::string::npos && nMarker > 0 &&
+        (IsDigit(sText[nMarker - 1]) || sText[nMarker - 1] == '.')) {
+        sText[nMarker] = 'E';
+    }
     return strtod_l(sText.c_str(), nullptr, kCLocale);
 }

@@ -18,8 +18,8 @@ VETRA_EXPORT std::string TrimWhitespace(const std::string& s);
 VETRA_EXPORT bool IsNumeric(const std::string& s);
 
 /// The number at the start of a text, read like `atof` in the C locale whatever locale the process
-/// has set: white space, sign, digits, point, exponent; 0.0 where no number starts. A D or d counts
-/// as E, so that every text that `IsNumeric` accepts is read whole: "1.5D3" is 1500. A number beyond
+/// has set: white space, sign, digits, point, exponent; 0.0 where no number starts. A D or d
+/// behind the digits counts as E, so that every text that `IsNumeric` accepts is read whole: "1.5D3" is 1500. A number beyond
 /// the range of double gives an infinity or 0.
 VETRA_EXPORT double TextToDouble(const std::string& s);
 

@@ -365,7 +365,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
     oSpan.pNearestSrc = SrcRow(nNearestRow);
     alignas(64) unsigned char abyMode[kSpanArray];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
-        const std::size_t nCol = static_cast<std::size_t>(nFirstCol) + nDone;
+        const std::size_t nCol = static_cast<std::size_t>(nFirstCol + nDone);
         oSpan.nFirst = nFirst + nDone;
         oSpan.nPix = std::min(kSpanPixels, nNumCols - nDone);
         oSpan.padfFracCol = moColumns.vdfFrac.data() + nCol;
@@ -374,8 +374,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
         } else {
+            const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
             for (int i = 0; i < kSpanPixels; ++i) {
-                abyMode[i] = moColumns.vbyClass[nCol + i] & nRowClass;
+                abyMode[i] = pabyClass[i] & nRowClass;
             }
             ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vnWindowCol.data() + nCol,
                         nWindowRow * moTask.nSrcCols, moColumns.vnNearestCol.data() + nCol,
@@ -442,37 +443,37 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
 // Writes one channel of a span: samples, background, or nothing, as each pixel's mode says.
 template <typename Bits>
 void Run::Deliver(const Span& oSpan, int nChannel, unsigned char* pabySample) const {
-    const int nChan = moTask.nChan;
-    char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::ptrdiff_t>(nChannel) * sizeof(Bits);
-    const auto fnWrite = [&](int i, const void* pSample) {
-        std::memcpy(pTgt + static_cast<std::ptrdiff_t>(i) * nChan * sizeof(Bits), pSample,
-                    sizeof(Bits));
-    };
-    const auto fnSample = [&](int i) { return pabySample + i * sizeof(Bits); };
+    constexpr std::size_t kBytes = sizeof(Bits);
+    const auto nPix = static_cast<std::size_t>(oSpan.nPix);
+    const std::size_t nStep = static_cast<std::size_t>(moTask.nChan) * kBytes;
+    char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::size_t>(nChannel) * kBytes;
     if ((oSpan.nModes & kSetUntouched) != 0) {
-        for (int i = 0; i < oSpan.nPix; ++i) {
+        for (std::size_t i = 0; i < nPix; ++i) {
             if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
-                fnWrite(i, oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground : fnSample(i));
+                std::memcpy(pTgt + i * nStep,
+                            oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground
+                                                                : pabySample + i * kBytes,
+                            kBytes);
             }
         }
         return;
     }
     if ((oSpan.nModes & kSetBackground) != 0) {
         Bits background;
-        std::memcpy(&background, moTask.pBackground, sizeof(Bits));
-        for (int i = 0; i < oSpan.nPix; ++i) {
+        std::memcpy(&background, moTask.pBackground, kBytes);
+        for (std::size_t i = 0; i < nPix; ++i) {
             Bits sample;
-            std::memcpy(&sample, fnSample(i), sizeof(Bits));
+            std::memcpy(&sample, pabySample + i * kBytes, kBytes);
             sample = oSpan.pabyMode[i] == ePO_BACKGROUND ? background : sample;
-            std::memcpy(fnSample(i), &sample, sizeof(Bits));
+            std::memcpy(pabySample + i * kBytes, &sample, kBytes);
         }
     }
-    if (nChan == 1) {
-        std::memcpy(pTgt, pabySample, static_cast<std::size_t>(oSpan.nPix) * sizeof(Bits));
+    if (nStep == kBytes) {
+        std::memcpy(pTgt, pabySample, nPix * kBytes);
         return;
     }
-    for (int i = 0; i < oSpan.nPix; ++i) {
-        fnWrite(i, fnSample(i));
+    for (std::size_t i = 0; i < nPix; ++i) {
+        std::memcpy(pTgt + i * nStep, pabySample + i * kBytes, kBytes);
     }
 }
 
