@@ -34,17 +34,19 @@ int main() {
         // centres.
         std::vector<float> vfCols(kSize * kSize);
         std::vector<float> vfRows(kSize * kSize);
+        float* pafCols = vfCols.data();
+        float* pafRows = vfRows.data();
         const double dfAngle = 10.0 * 3.14159265358979 / 180.0;
         const double dfCentre = (kSize - 1) / 2.0;
         for (int i = 0; i < kSize * kSize; ++i) {
             const double x = i % kSize - dfCentre;
             const double y = i / kSize - dfCentre;
-            vfCols[i] =
+            pafCols[i] =
                 static_cast<float>(dfCentre + x * std::cos(dfAngle) - y * std::sin(dfAngle));
-            vfRows[i] =
+            pafRows[i] =
                 static_cast<float>(dfCentre + x * std::sin(dfAngle) + y * std::cos(dfAngle));
         }
-        const BufPosArrayTfm oPositions(kSize, kSize, vfCols.data(), 0, vfRows.data(), 0, false);
+        const BufPosArrayTfm oPositions(kSize, kSize, pafCols, 0, pafRows, 0, false);
 
         BilinearResampler oResampler;
         oResampler.SetOutBgd(0.0);  // what falls outside the source becomes black

@@ -1,0 +1,105 @@
+#include "gdalraster/targetraster.h"
+
+#include <cpl_conv.h>
+#include <cpl_string.h>
+
+#include "gdalraster/description.h"
+#include "gdalraster/errors.h"
+#include "gdalraster/pixeltypes.h"
+
+namespace vetra::tool {
+
+namespace {
+
+constexpr const char* kCannotCreate = "can't create the target";
+constexpr const char* kCannotWrite = "can't write the target";
+
+}  // namespace
+
+TargetRaster::TargetRaster(GDALDriver& oDriver, const std::string& sPath, const TargetPlan& oPlan,
+                           SourceRaster& oSource) {
+    GdalMessages::ForgetFailures();
+    const CPLStringList oOptions =
+        CompleteOptions(oDriver, oPlan.oOptions, oSource, oPlan.oGrid, oPlan.eType);
+    const int nNumBands = static_cast<int>(oSource.GetBands().size());
+    mpoDataset.reset(oDriver.Create(sPath.c_str(), oPlan.oGrid.nCols, oPlan.oGrid.nRows, nNumBands,
+                                    ToGdalType(oPlan.eType), oOptions.List()));
+    if (!mpoDataset) {
+        GdalMessages::Throw(kCannotCreate);
+    }
+    GdalMessages::ThrowIfFailed(kCannotCreate);
+    if (mpoDataset->GetRasterBand(1)->GetRasterDataType() != ToGdalType(oPlan.eType)) {
+        throw RunError("the target's format has chosen another pixel type");
+    }
+    CopyDescription(oSource.GetDataset(), oPlan.oGrid, oPlan.bSameValues, *mpoDataset);
+    if (oPlan.oNodata) {
+        for (int nBand = 1; nBand <= nNumBands; ++nBand) {
+            if (!oSource.GetBands()[static_cast<std::size_t>(nBand) - 1].bAlpha &&
+                !oPlan.oNodata->Declare(*mpoDataset->GetRasterBand(nBand))) {
+                GdalMessages::Throw("can't store a nodata value in the target");
+            }
+        }
+    }
+    if (oPlan.bMaskBand) {
+        // In the file itself where the format allows it, and on this thread only.
+        const CPLConfigOptionSetter oInternal("GDAL_TIFF_INTERNAL_MASK", "YES", false);
+        if (mpoDataset->CreateMaskBand(GMF_PER_DATASET) != CE_None) {
+            GdalMessages::Throw("can't store a mask in the target");
+        }
+        mpoMask = mpoDataset->GetRasterBand(1)->GetMaskBand();
+    }
+    GdalMessages::ThrowIfFailed(kCannotCreate);
+}
+
+TargetRaster::~TargetRaster() {
+    if (mpoDataset) {
+        // Nobody wants the pixels that closing would write.
+        mpoDataset->MarkSuppressOnClose();
+    }
+}
+
+void TargetRaster::Write(const utils::PixelRect& oRect, BandArrays& oArrays,
+                         unsigned char* pabyMask) {
+    GdalMessages::ForgetFailures();
+    if (!oArrays.Transfer(*mpoDataset, GF_Write, oRect)) {
+        GdalMessages::Throw(kCannotWrite);
+    }
+    if (mpoMask != nullptr &&
+        mpoMask->RasterIO(GF_Write, oRect.nCol, oRect.nRow, oRect.nCols, oRect.nRows, pabyMask,
+                          oRect.nCols, oRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
+        GdalMessages::Throw(kCannotWrite);
+    }
+    // A block that the cache writes later fails without a status for anyone.
+    GdalMessages::ThrowIfFailed(kCannotWrite);
+}
+
+void TargetRaster::Close() {
+    GdalMessages::ForgetFailures();
+    mpoDataset->FlushCache(false);
+    GdalMessages::ThrowIfFailed(kCannotWrite);
+    mpoDataset.reset();
+    GdalMessages::ThrowIfFailed(kCannotWrite);
+}
+
+void CopyRaster(const std::string& sFrom, GDALDriver& oDriver, const std::string& sTo,
+                const std::vector<std::string>& oOptions, GDALProgressFunc fnProgress,
+                void* poProgressData) {
+    CPLStringList oList;
+    for (const std::string& sOption : oOptions) {
+        oList.AddString(sOption.c_str());
+    }
+    GdalMessages::ForgetFailures();
+    const GDALDatasetUniquePtr poFrom(GDALDataset::Open(sFrom.c_str(), GDAL_OF_RASTER));
+    if (!poFrom) {
+        GdalMessages::Throw(kCannotWrite);
+    }
+    GDALDatasetUniquePtr poTo(oDriver.CreateCopy(sTo.c_str(), poFrom.get(), TRUE, oList.List(),
+                                                 fnProgress, poProgressData));
+    if (!poTo) {
+        GdalMessages::Throw(kCannotWrite);
+    }
+    poTo.reset();
+    GdalMessages::ThrowIfFailed(kCannotWrite);
+}
+
+}  // namespace vetra::tool

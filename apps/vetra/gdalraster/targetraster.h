@@ -1,0 +1,57 @@
+#ifndef VETRA_APPS_GDALRASTER_TARGETRASTER_H
+#define VETRA_APPS_GDALRASTER_TARGETRASTER_H
+
+#include <gdal_priv.h>
+
+#include <optional>
+#include <string>
+#include <vector>
+
+#include "gdalraster/bandarrays.h"
+#include "gdalraster/grid.h"
+#include "gdalraster/nodatavalue.h"
+#include "gdalraster/sourceraster.h"
+#include "gdalraster/targetformat.h"
+
+namespace vetra::tool {
+
+/// What a new image is to be.
+struct TargetPlan {
+    Grid oGrid;
+    gobs::NativeDataTypeCode eType = gobs::eDT_UNKNOWN;
+    std::optional<NodataValue> oNodata;
+    bool bMaskBand = false;
+    bool bSameValues = false;  ///< see `CopyDescription`
+    std::vector<std::string> oOptions;
+};
+
+/// An image file being written. One that is not closed is abandoned: its maker deletes it.
+class TargetRaster {
+ public:
+    /// Creates the file with the description of \p oSource.
+    /// \throws RunError when GDAL can't.
+    TargetRaster(GDALDriver& oDriver, const std::string& sPath, const TargetPlan& oPlan,
+                 SourceRaster& oSource);
+    TargetRaster(const TargetRaster&) = delete;
+    TargetRaster& operator=(const TargetRaster&) = delete;
+    ~TargetRaster();
+
+    /// Writes a rectangle of all bands, and its mask (0 or 255 per pixel) where there is one.
+    void Write(const utils::PixelRect& oRect, BandArrays& oArrays, unsigned char* pabyMask);
+    /// Writes what is still in memory.
+    void Close();
+
+ private:
+    GDALDatasetUniquePtr mpoDataset;
+    GDALRasterBand* mpoMask = nullptr;
+};
+
+/// Writes a finished image as another format.
+/// \param fnProgress  as `GDALProgressFunc`; stops the work by returning FALSE
+void CopyRaster(const std::string& sFrom, GDALDriver& oDriver, const std::string& sTo,
+                const std::vector<std::string>& oOptions, GDALProgressFunc fnProgress,
+                void* poProgressData);
+
+}  // namespace vetra::tool
+
+#endif  // VETRA_APPS_GDALRASTER_TARGETRASTER_H

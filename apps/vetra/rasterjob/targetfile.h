@@ -1,0 +1,43 @@
+#ifndef VETRA_APPS_RASTERJOB_TARGETFILE_H
+#define VETRA_APPS_RASTERJOB_TARGETFILE_H
+
+#include <filesystem>
+#include <string>
+
+#include "gdalraster/sourceraster.h"
+
+namespace vetra::tool {
+
+/// The file that a path names as a target: that at the end of its links.
+/// \throws RunError when something other than a file is there, or when it is a file of the source.
+std::filesystem::path ResolveTarget(const std::string& sPath, SourceRaster& oSource);
+
+/// Lets an image with all its side files grow in a hidden folder beside its later place, and moves
+/// it there when it is whole. Until then nothing at the target's name changes.
+class TargetFile {
+ public:
+    /// \throws RunError when no folder can be made beside the target.
+    explicit TargetFile(std::filesystem::path oPath);
+    TargetFile(const TargetFile&) = delete;
+    TargetFile& operator=(const TargetFile&) = delete;
+    /// Removes the folder with whatever is in it.
+    ~TargetFile();
+
+    /// Where to write the image: the target's name in the folder.
+    std::string GetPath() const { return moFolder / moPath.filename(); }
+    /// Where to write an image that the target is made from.
+    std::string GetStagePath() const { return moStage / "stage.tif"; }
+    /// Moves the image and its side files to their place. Side files of an image that was there
+    /// before go: they would be taken for those of the new one.
+    /// \param oSource  its files are kept
+    void Commit(SourceRaster& oSource);
+
+ private:
+    std::filesystem::path moPath;
+    std::filesystem::path moFolder;
+    std::filesystem::path moStage;
+};
+
+}  // namespace vetra::tool
+
+#endif  // VETRA_APPS_RASTERJOB_TARGETFILE_H

@@ -1,0 +1,137 @@
+#include <signal.h>
+#include <sys/wait.h>
+#include <unistd.h>
+
+#include <chrono>
+#include <filesystem>
+#include <thread>
+
+#include "tests/apps/vetra/tooltest.h"
+
+namespace {
+
+namespace fs = std::filesystem;
+
+TEST_F(ToolTest, FailuresGiveOneLineAndLeaveNothing) {
+    Fill(*Create("a.tif", 200, 200, 3, GDT_Byte), [](int, int nCol, int) { return nCol; });
+    Fill(*Create("old.tif", 3, 3, 1, GDT_Byte), [](int, int, int) { return 4; });
+    Fill(*Create("cut.tif", 200, 200, 1, GDT_UInt16), [](int, int nCol, int) { return nCol; });
+    fs::resize_file(Path("cut.tif"), 50000);
+    Fill(*Create("cuthead.tif", 9, 9, 1, GDT_Byte), [](int, int, int) { return 1; });
+    fs::resize_file(Path("cuthead.tif"), 6);
+    fs::create_symlink("a.tif", Path("link.tif"));
+    fs::create_directory(Path("folder"));
+    {
+        const GDALDatasetUniquePtr po = Create("palette.tif", 9, 9, 1, GDT_Byte);
+        GDALColorTable oColours;
+        const GDALColorEntry oRed = {200, 10, 20, 255};
+        oColours.SetColorEntry(3, &oRed);
+        po->GetRasterBand(1)->SetColorTable(&oColours);
+    }
+    const std::set<std::string> oBefore = List();
+    const std::string sOld = ReadBytes("old.tif");
+    struct Case {
+        int nStatus;
+        const char* pszArgs;
+        const char* pszMessage;
+        const char* pszBefore = "";
+    };
+    const Case kCases[] = {
+        {2, "", "subcommand"},
+        {2, "resample a.tif", "DST"},
+        {2, "resample a.tif old.tif", "--size,--scale,--res"},
+        {2, "resample a.tif old.tif --size 4 4 --scale 1", "2 were given"},
+        {2, "resample a.tif old.tif --size 4", "--size"},
+        {2, "resample a.tif old.tif --size 0 4", "--size"},
+        {2, "resample a.tif old.tif --scale -1", "--scale"},
+        {2, "resample a.tif old.tif --scale nan", "--scale"},
+        {2, "resample a.tif old.tif --scale 1x", "--scale"},
+        {2, "resample a.tif old.tif --scale 1 --method BEST", "BEST"},
+        {2, "resample a.tif old.tif --scale 1 --type 12U", "12U"},
+        {2, "resample a.tif old.tif --scale 1 --nodata none", "none"},
+        {2, "resample a.tif old.tif --scale 1 --fill black", "black"},
+        {2, "resample a.tif old.tif --scale 1 --threads -1", "--threads"},
+        {2, "resample a.tif old.tif --scale 1 --memory 0", "--memory"},
+        {2, "resample a.tif old.tif --scale 1 --of NOPE", "NOPE"},
+        {2, "resample a.tif old.tif --scale 1 --co TILED", "TILED"},
+        {2, "resample a.tif old.tif --scale 1 --fast", "--fast"},
+        {1, "resample none.tif old.tif --scale 1", "none.tif"},
+        {1, "resample cuthead.tif old.tif --scale 1", "cuthead.tif"},
+        {1, "resample cut.tif old.tif --scale 1 -q", "can't read the pixels"},
+        {1, "resample cut.tif old.png --scale 1 --memory 1", "can't read the pixels"},
+        {1, "resample a.tif a.tif --scale 1", "a.tif"},
+        {1, "resample a.tif link.tif --scale 1", "link.tif"},
+        {1, "resample a.tif folder --scale 1", "not a file"},
+        {1, "resample a.tif folder/none/b.tif --scale 1", "folder/none"},
+        {1, "resample a.tif /proc/b.tif --scale 1", "/proc"},
+        {1, "resample a.tif /dev/null --scale 1", "not a file"},
+        {1, "resample a.tif old.tif --res 2", "--res"},
+        {1, "resample a.tif old.tif --scale 1e9", "too many"},
+        {1, "resample a.tif old.tif --scale 1 --type 16U", "16U"},
+        {1, "resample a.tif old.tif --scale 1 --type C32R", "C32R"},
+        {1, "resample a.tif old.png --scale 1 --type 32R", "PNG"},
+        {1, "resample a.tif old.tif --scale 1 --nodata 256", "256"},
+        {1, "resample palette.tif old.tif --scale 2", "palette"},
+        {1, "resample a.tif old.tif --scale 4 -q", "can't write", "ulimit -f 100;"},
+        {1, "resample a.tif old.tif --scale 4 -q --co COMPRESS=LZW", "can't", "ulimit -f 4;"},
+        {1, "resample a.tif old.png --scale 4 -q", "can't write", "ulimit -f 100;"},
+        {1, "resample a.tif new.tif --scale 1 -q", "can't", "ulimit -f 1;"},
+    };
+    for (const Case& oCase : kCases) {
+        const Outcome oOutcome = Run(oCase.pszArgs, oCase.pszBefore);
+        EXPECT_EQ(oOutcome.nStatus, oCase.nStatus) << oCase.pszArgs << oOutcome.sErr;
+        const std::string& sErr = oOutcome.sErr;
+        EXPECT_TRUE(sErr.starts_with("vetra: error: ") && sErr.find('\n') == sErr.size() - 1)
+            << oCase.pszArgs << ": " << sErr;
+        EXPECT_NE(sErr.find(oCase.pszMessage), std::string::npos) << oCase.pszArgs << ": " << sErr;
+        EXPECT_EQ(List(), oBefore) << oCase.pszArgs;
+        EXPECT_TRUE(ReadBytes("old.tif") == sOld) << oCase.pszArgs;
+    }
+    EXPECT_TRUE(fs::is_empty(Path("folder")));
+}
+
+TEST_F(ToolTest, ASignalLeavesNothing) {
+    // Sparse: large at once, and long enough at work.
+    Create("a.tif", 30000, 30000, 1, GDT_Byte, "SPARSE_OK=TRUE").reset();
+    Fill(*Create("old.tif", 3, 3, 1, GDT_Byte), [](int, int, int) { return 4; });
+    const std::set<std::string> oBefore = List();
+    const std::string sOld = ReadBytes("old.tif");
+    for (const int nSignal : {SIGTERM, SIGINT}) {
+        const pid_t nChild = fork();
+        ASSERT_GE(nChild, 0);
+        if (nChild == 0) {
+            execl(VETRA_TOOL, "vetra", "resample", Path("a.tif").c_str(), Path("old.tif").c_str(),
+                  "--scale", "1", "-q", static_cast<char*>(nullptr));
+            _exit(127);
+        }
+        const auto oEnd = std::chrono::steady_clock::now() + std::chrono::seconds(20);
+        while (List() == oBefore && std::chrono::steady_clock::now() < oEnd) {
+            std::this_thread::sleep_for(std::chrono::milliseconds(1));
+        }
+        EXPECT_NE(List(), oBefore) << "the run makes no file";
+        kill(nChild, nSignal);
+        int nStatus = 0;
+        ASSERT_EQ(waitpid(nChild, &nStatus, 0), nChild);
+        EXPECT_TRUE(WIFSIGNALED(nStatus) && WTERMSIG(nStatus) == nSignal) << nStatus;
+        EXPECT_EQ(List(), oBefore);
+        EXPECT_TRUE(ReadBytes("old.tif") == sOld);
+    }
+}
+
+TEST_F(ToolTest, TellsWhatItIsAndDoes) {
+    Fill(*Create("a.tif", 300, 300, 1, GDT_Byte), [](int, int nCol, int) { return nCol; });
+    const Outcome oRun = Run("resample a.tif b.tif --scale 2 --memory 1");
+    EXPECT_EQ(oRun.sOut, "0...10...20...30...40...50...60...70...80...90...100 - done.\n");
+    EXPECT_EQ(oRun.sErr, "");
+    EXPECT_EQ(Run("resample a.tif b.tif --scale 2 --quiet").sOut, "");
+    const Outcome oMethods = Run("methods");
+    EXPECT_EQ(oMethods.nStatus, 0);
+    for (const char* pszText :
+         {"\nSQKERNEL ", "\nCPLXSAR ", "\nLAGRANGE8   8 x 8   -3 -3 4 4 ", "free parameter -1"}) {
+        EXPECT_NE(oMethods.sOut.find(pszText), std::string::npos) << pszText;
+    }
+    EXPECT_EQ(Run("--version").sOut.rfind("vetra ", 0), 0u);
+    EXPECT_NE(Run("resample --help").sOut.find("--dst-nodata"), std::string::npos);
+}
+
+}  // namespace
