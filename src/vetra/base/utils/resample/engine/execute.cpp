@@ -49,6 +49,7 @@ struct Span {
     const double* padfFracCol = nullptr;
     const double* padfFracRow = nullptr;
     bool bOneRow = false;
+    const PairGroup* poGroups = nullptr;
 
     const unsigned char* ModesUnless(unsigned nSet) const {
         return nModes == nSet ? nullptr : pabyMode;
@@ -97,6 +98,8 @@ struct ColumnTables {
     std::vector<unsigned char> vbyClass;
     // Modes by the class of the row, where no mask has a say.
     std::vector<unsigned char> avbyMode[4];
+    // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
+    std::vector<PairGroup> voGroups;
 };
 
 class Run {
@@ -110,6 +113,7 @@ class Run {
 
  private:
     void MakeColumnTables();
+    void MakePairGroups();
 
     void WalkGeneral(long long nBegin, long long nEnd) const;
     void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
@@ -187,6 +191,7 @@ Run::Run(const Task& oTask)
         }
         if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
             MakeColumnTables();
+            MakePairGroups();
         }
     }
 }
@@ -229,6 +234,32 @@ void Run::MakeColumnTables() {
         vbyMode.resize(nSize);
         for (std::size_t i = 0; i < nSize; ++i) {
             vbyMode[i] = moModes.Get(ePO_INTERPOLATED, moColumns.vbyClass[i] & nRowClass);
+        }
+    }
+}
+
+// The samples of eight neighbouring columns lie close together unless the scale is large: one load
+// and a shuffle replace eight loads.
+void Run::MakePairGroups() {
+    if (moMethod.papfnValues == nullptr || moMethod.oWindow.nCols != 2 || mnSrcBytes != 1 ||
+        moTask.nChan != 1 || mnPitch < PairGroup::kBytes) {
+        return;
+    }
+    moColumns.voGroups.resize(static_cast<std::size_t>(moTask.nTgtCols) / kLanes + 1);
+    for (std::size_t g = 0; g < moColumns.voGroups.size(); ++g) {
+        PairGroup& oGroup = moColumns.voGroups[g];
+        const std::int64_t* panOffset = moColumns.vnWindow.data() + g * kLanes;
+        const auto [itFirst, itLast] = std::minmax_element(panOffset, panOffset + kLanes);
+        // The load ends with the row at the latest, so it stays in the source.
+        oGroup.nOffset = std::min<std::int64_t>(*itFirst, mnPitch - PairGroup::kBytes);
+        if (*itLast + 1 - oGroup.nOffset >= PairGroup::kBytes) {
+            oGroup.nOffset = -1;
+            continue;
+        }
+        for (int i = 0; i < kLanes; ++i) {
+            const auto nPlace = static_cast<unsigned char>(panOffset[i] - oGroup.nOffset);
+            oGroup.abyPlace[i] = nPlace;
+            oGroup.abyPlace[kLanes + i] = static_cast<unsigned char>(nPlace + 1);
         }
     }
 }
@@ -371,6 +402,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         oSpan.padfFracCol = moColumns.vdfFrac.data() + nCol;
         oSpan.panWindow = moColumns.vnWindow.data() + nCol;
         oSpan.panNearest = moColumns.vnNearest.data() + nCol;
+        oSpan.poGroups = moColumns.voGroups.empty() || nCol % kLanes != 0
+                             ? nullptr
+                             : moColumns.voGroups.data() + nCol / kLanes;
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
         } else {
@@ -407,9 +441,16 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     }
     const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
     const bool bNearest = (oSpan.nModes & kSetNearest) != 0;
-    const WindowSpan oWindows{
-        oSpan.panWindow, oSpan.padfFracCol, oSpan.padfFracRow, oSpan.ModesUnless(kSetInterpolated),
-        oSpan.nPix,      mnPitch,           moTask.nChan,      oSpan.bOneRow};
+    WindowSpan oWindows;
+    oWindows.panOffset = oSpan.panWindow;
+    oWindows.padfFracCol = oSpan.padfFracCol;
+    oWindows.padfFracRow = oSpan.padfFracRow;
+    oWindows.pabyMode = oSpan.ModesUnless(kSetInterpolated);
+    oWindows.nPix = oSpan.nPix;
+    oWindows.nPitch = mnPitch;
+    oWindows.nChan = moTask.nChan;
+    oWindows.bOneRow = oSpan.bOneRow;
+    oWindows.poGroups = oSpan.poGroups;
     for (int nChannel = 0; nChannel < moTask.nChan; ++nChannel) {
         const std::ptrdiff_t nShift = static_cast<std::ptrdiff_t>(nChannel) * mnSrcBytes;
         if (bWindows) {

@@ -53,6 +53,15 @@ struct BilinearCorners {
     int nRows;
 };
 
+/// How to pick the pairs of samples of eight pixels out of sixteen adjacent 8-bit samples.
+struct PairGroup {
+    static constexpr int kBytes = 16;
+    /// Of the sixteen samples, from the start of the row; below 0 where they don't hold all pairs.
+    std::int64_t nOffset;
+    /// Places of the first samples, then of the second ones.
+    unsigned char abyPlace[kBytes];
+};
+
 /// The windows of a span, in mode 1, as the methods see them. Pixels of other modes have offset 0:
 /// a stage may compute them, but nobody uses what comes out.
 struct WindowSpan {
@@ -70,6 +79,9 @@ struct WindowSpan {
     int nChan;
     /// All pixels share the first row fraction: the transform is axis-aligned.
     bool bOneRow;
+    /// Of each eight pixels, for 8-bit samples and windows of two columns in an axis-aligned run of
+    /// one channel; else null.
+    const PairGroup* poGroups;
 };
 
 /// What a store stage knows of the output type's clamp.

@@ -16,6 +16,7 @@
 //                                neither of two adjacent bytes is 0
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
+//   ShufflePairs                 pairs of samples out of sixteen, as a PairGroup says
 //   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
 //   StoreSamples                 eight values that T can hold (float: rounds to nearest)
 
@@ -278,6 +279,18 @@ struct WindowReader {
     }
 };
 
+// The same where sixteen adjacent samples hold all pairs.
+template <typename T>
+struct GroupReader {
+    const T* pFirst;
+    const PairGroup* poGroup;
+    std::int64_t nPitch;
+
+    void Pair(int nRow, F64& a, F64& b) const {
+        ShufflePairs(pFirst + nRow * nPitch + poGroup->nOffset, poGroup->abyPlace, a, b);
+    }
+};
+
 template <typename Method, typename T, bool kSingleChannel, bool kOneRow>
 void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
     for (int i = 0; i < oSpan.nPix; i += kLanes) {
@@ -288,7 +301,16 @@ void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
         const F64 dy = kOneRow ? Set1(oSpan.padfFracRow[0]) : Load(oSpan.padfFracRow + i);
         const WindowReader<T, kSingleChannel> oWindow{pSrc, oSpan.panOffset + i, oSpan.nPitch,
                                                       oSpan.nChan};
-        F64 value = Method::Value(oWindow, dx, dy);
+        F64 value;
+        if constexpr (sizeof(T) == 1 && kSingleChannel && kOneRow) {
+            const PairGroup* poGroup =
+                oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
+            value = poGroup != nullptr && poGroup->nOffset >= 0
+                        ? Method::Value(GroupReader<T>{pSrc, poGroup, oSpan.nPitch}, dx, dy)
+                        : Method::Value(oWindow, dx, dy);
+        } else {
+            value = Method::Value(oWindow, dx, dy);
+        }
         if constexpr (kIsFloating<T>) {
             // Which bits a NaN gets from arithmetic depends on the processor and on the order of
             // operands, which a compiler may exchange.
