@@ -1,6 +1,7 @@
 #include "table.h"
 
 #include <cstdio>
+#include <string>
 
 #include "workload.h"
 
@@ -18,18 +19,19 @@ void TableReporter::ReportRuns(const std::vector<Run>& voRuns) {
             continue;
         }
         const std::string sWork = sName.substr(0, nSlash);
-        auto& voTimes = moTimes[sWork];
-        if (voTimes.empty()) {
-            mvsWorks.push_back(sWork);
-        }
-        voTimes.emplace_back(sName.substr(nSlash + 1), oRun.GetAdjustedRealTime() / kTargetPixels);
+        moTimes[sWork].emplace_back(sName.substr(nSlash + 1),
+                                    oRun.GetAdjustedRealTime() / kTargetPixels);
     }
 }
 
 void TableReporter::Finalize() {
     std::printf("| work | vetra, ns per pixel | peer, ns per pixel | ours / peer's |\n");
     std::printf("|---|---|---|---|\n");
-    for (const std::string& sWork : mvsWorks) {
+    for (const Work& oWork : AllWorks()) {
+        const std::string sWork = oWork.Name();
+        if (moTimes[sWork].empty()) {
+            continue;
+        }
         double dfOurs = 0.0;
         for (const auto& [sLibrary, dfTime] : moTimes[sWork]) {
             dfOurs = sLibrary == "vetra" ? dfTime : dfOurs;

@@ -17,7 +17,6 @@ class TableReporter : public benchmark::BenchmarkReporter {
     void Finalize() override;
 
  private:
-    std::vector<std::string> mvsWorks;
     std::map<std::string, std::vector<std::pair<std::string, double>>> moTimes;
 };
 
