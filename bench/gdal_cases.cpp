@@ -74,14 +74,14 @@ Case GdalCase(const Work& oWork) {
         poOptions->pfnTransformer = RotatedTransform;
         poOptions->dfWarpMemoryLimit = 1e9;
         GDALWarpInitDefaultBandMapping(poOptions.get(), oWork.nChan);
-        return {"GDAL warp", [=] {
+        // The options refer to the datasets, which have to live as long.
+        return {"GDAL", [poOptions, poSrc, poTgt] {
                     GDALWarpOperation oOperation;
                     Check(oOperation.Initialize(poOptions.get()));
                     Check(oOperation.ChunkAndWarpImage(0, 0, kTargetSize, kTargetSize));
-                    static_cast<void>(poTgt);
                 }};
     }
-    return {"GDAL RasterIO", [=] {
+    return {"GDAL", [=] {
                 GDALRasterIOExtraArg oExtra;
                 INIT_RASTERIO_EXTRA_ARG(oExtra);
                 oExtra.eResampleAlg = oWork.bBilinear ? GRIORA_Bilinear : GRIORA_NearestNeighbour;

@@ -19,14 +19,14 @@ Case OpenCvCase(const Work& oWork) {
     if (oWork.eGeometry == Work::Geometry::eRotated) {
         const cv::Mat oCols(kTargetSize, kTargetSize, CV_32F, RotatedCols().data());
         const cv::Mat oRows(kTargetSize, kTargetSize, CV_32F, RotatedRows().data());
-        return {"OpenCV remap", [=] {
+        return {"OpenCV", [=] {
                     cv::setNumThreads(nThreads);
                     cv::remap(oSrc, oTgt, oCols, oRows, nMethod);
                 }};
     }
     const int nFirst = static_cast<int>(FirstSource(oWork.eGeometry));
     const cv::Rect oWindow(nFirst, nFirst, kSourceSize - 2 * nFirst, kSourceSize - 2 * nFirst);
-    return {"OpenCV resize", [=, oPart = oSrc(oWindow)] {
+    return {"OpenCV", [=, oPart = oSrc(oWindow)] {
                 cv::setNumThreads(nThreads);
                 cv::resize(oPart, oTgt, oTgt.size(), 0, 0, nMethod);
             }};

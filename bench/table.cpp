@@ -3,6 +3,7 @@
 #include <cstdio>
 #include <string>
 
+#include "vetra/textcore/formatstring.h"
 #include "workload.h"
 
 bool TableReporter::ReportContext(const Context&) { return true; }
@@ -19,34 +20,27 @@ void TableReporter::ReportRuns(const std::vector<Run>& voRuns) {
             continue;
         }
         const std::string sWork = sName.substr(0, nSlash);
-        moTimes[sWork].emplace_back(sName.substr(nSlash + 1),
-                                    oRun.GetAdjustedRealTime() / kTargetPixels);
+        moTimes[sWork][sName.substr(nSlash + 1)] = oRun.GetAdjustedRealTime() / kTargetPixels;
     }
 }
 
 void TableReporter::Finalize() {
-    std::printf("| work | vetra, ns per pixel | peer, ns per pixel | ours / peer's |\n");
-    std::printf("|---|---|---|---|\n");
+    std::printf("| work | vetra | OpenCV | GDAL | ours / OpenCV's | ours / GDAL's |\n");
+    std::printf("|---|---|---|---|---|---|\n");
+    const auto fnCell = [](double df) {
+        return df > 0.0 ? FormatString("%.2f", df) : std::string();
+    };
     for (const Work& oWork : AllWorks()) {
-        const std::string sWork = oWork.Name();
-        if (moTimes[sWork].empty()) {
+        auto& oTimes = moTimes[oWork.Name()];
+        if (oTimes.empty()) {
             continue;
         }
-        double dfOurs = 0.0;
-        for (const auto& [sLibrary, dfTime] : moTimes[sWork]) {
-            dfOurs = sLibrary == "vetra" ? dfTime : dfOurs;
-        }
-        const char* pszWork = sWork.c_str();
-        bool bAlone = true;
-        for (const auto& [sLibrary, dfTime] : moTimes[sWork]) {
-            if (sLibrary != "vetra") {
-                std::printf("| %s | %.2f | %s: %.2f | %.2f |\n", pszWork, dfOurs, sLibrary.c_str(),
-                            dfTime, dfOurs / dfTime);
-                bAlone = false;
-            }
-        }
-        if (bAlone) {
-            std::printf("| %s | %.2f | | |\n", pszWork, dfOurs);
-        }
+        const double dfOurs = oTimes["vetra"];
+        const double dfOpenCv = oTimes["OpenCV"];
+        const double dfGdal = oTimes["GDAL"];
+        std::printf("| %s | %s | %s | %s | %s | %s |\n", oWork.Name().c_str(),
+                    fnCell(dfOurs).c_str(), fnCell(dfOpenCv).c_str(), fnCell(dfGdal).c_str(),
+                    fnCell(dfOpenCv > 0.0 ? dfOurs / dfOpenCv : 0.0).c_str(),
+                    fnCell(dfGdal > 0.0 ? dfOurs / dfGdal : 0.0).c_str());
     }
 }

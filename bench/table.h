@@ -5,11 +5,11 @@
 
 #include <map>
 #include <string>
-#include <utility>
 #include <vector>
 
 /// Collects the medians of benchmarks named "work/library" and prints them as a Markdown table:
-/// nanoseconds per target pixel, and the ratio of our time to each peer's.
+/// nanoseconds per target pixel, and the ratio of our time to each peer's. OpenCV's are remap and
+/// resize, GDAL's the warper and RasterIO.
 class TableReporter : public benchmark::BenchmarkReporter {
  public:
     bool ReportContext(const Context& oContext) override;
@@ -17,7 +17,8 @@ class TableReporter : public benchmark::BenchmarkReporter {
     void Finalize() override;
 
  private:
-    std::map<std::string, std::vector<std::pair<std::string, double>>> moTimes;
+    /// By work, then by library.
+    std::map<std::string, std::map<std::string, double>> moTimes;
 };
 
 #endif  // VETRA_BENCH_TABLE_H

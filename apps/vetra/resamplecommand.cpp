@@ -110,7 +110,8 @@ void AddResampleCommand(CLI::App& oApp) {
         "The target image; one that exists is replaced when the run has succeeded")
         ->required();
 
-    CLI::Option_group* poGrid = poCommand->add_option_group("Size", "How many pixels the target has");
+    CLI::Option_group* poGrid =
+        poCommand->add_option_group("Size", "How many pixels the target has");
     poGrid->formatter(poFormatter);
     poGrid->require_option(1);
     Add(poGrid, "--size", poTexts->oSize, "COLS ROWS", "Number of columns and rows")

@@ -20,7 +20,7 @@ int ToPixels(double dfPixels, const char* pszWhat) {
 
 // The largest number of pixels whose centres all lie inside the source.
 int FillSource(int nSrcPixels, double dfScale, const char* pszWhat) {
-    int nPixels = ToPixels(std::ceil(nSrcPixels / dfScale - 0.5), pszWhat);
+    int nPixels = ToPixels(std::ceil(nSrcPixels / dfScale), pszWhat);
     while (nPixels > 1 && (nPixels - 0.5) * dfScale >= nSrcPixels) {
         --nPixels;
     }

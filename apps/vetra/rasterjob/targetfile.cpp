@@ -43,7 +43,7 @@ fs::path ResolveTarget(const std::string& sPath, SourceRaster& oSource) {
         throw RunError("the target " + sPath + " is not in the file system");
     }
     std::error_code oError;
-    fs::path oPath = fs::weakly_canonical(sPath, oError);
+    fs::path oPath = fs::weakly_canonical(fs::absolute(sPath), oError);
     if (oError) {
         ThrowWith("can't use the target " + sPath, oError);
     }

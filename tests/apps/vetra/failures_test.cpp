@@ -1,3 +1,4 @@
+#include <fcntl.h>
 #include <signal.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -36,6 +37,7 @@ TEST_F(ToolTest, FailuresGiveOneLineAndLeaveNothing) {
         const char* pszMessage;
         const char* pszBefore = "";
     };
+    // The shell counts file sizes in units of 512 or 1024 bytes.
     const Case kCases[] = {
         {2, "", "subcommand"},
         {2, "resample a.tif", "DST"},
@@ -73,9 +75,9 @@ TEST_F(ToolTest, FailuresGiveOneLineAndLeaveNothing) {
         {1, "resample a.tif old.tif --scale 1 --nodata 256", "256"},
         {1, "resample palette.tif old.tif --scale 2", "palette"},
         {1, "resample a.tif old.tif --scale 4 -q", "can't write", "ulimit -f 100;"},
-        {1, "resample a.tif old.tif --scale 4 -q --co COMPRESS=LZW", "can't", "ulimit -f 4;"},
+        {1, "resample a.tif old.tif --scale 4 -q --co COMPRESS=LZW", "can't", "ulimit -f 8;"},
         {1, "resample a.tif old.png --scale 4 -q", "can't write", "ulimit -f 100;"},
-        {1, "resample a.tif new.tif --scale 1 -q", "can't", "ulimit -f 1;"},
+        {1, "resample a.tif new.tif --scale 1 -q", "can't", "ulimit -f 110;"},
     };
     for (const Case& oCase : kCases) {
         const Outcome oOutcome = Run(oCase.pszArgs, oCase.pszBefore);
@@ -100,6 +102,7 @@ TEST_F(ToolTest, ASignalLeavesNothing) {
         const pid_t nChild = fork();
         ASSERT_GE(nChild, 0);
         if (nChild == 0) {
+            dup2(open("/dev/null", O_WRONLY), STDERR_FILENO);
             execl(VETRA_TOOL, "vetra", "resample", Path("a.tif").c_str(), Path("old.tif").c_str(),
                   "--scale", "1", "-q", static_cast<char*>(nullptr));
             _exit(127);

@@ -142,6 +142,10 @@ TEST_F(ToolTest, MasksNeverMixWithData) {
             ASSERT_EQ(vdfPixels[i + 2 * vdfMask.size()], 0) << sSource << n;
         }
     }
+    // A nodata value goes into the colours alone.
+    Succeed("resample alpha.tif b.tif --scale 1 --method NEAR --dst-nodata 7 -q");
+    EXPECT_EQ(Read("b.tif")[3 * kCols * kRows + 3 * kCols + 15], 0);
+    EXPECT_EQ(Read("b.tif")[3 * kCols + 15], 7);
     // What was masked stays so in a format whose driver only copies.
     Succeed("resample alpha.tif b.png --scale 1 --method NEAR -q");
     EXPECT_EQ(Read("b.png")[3 * kCols * kRows + 3 * kCols + 15], 0);

@@ -40,7 +40,7 @@ TEST_F(ToolTest, EveryTypeKeepsItsSamples) {
         if (GDALGetDataTypeSizeBytes(eType) == 0) {
             continue;
         }
-        const GDALDatasetUniquePtr poSource =
+        GDALDatasetUniquePtr poSource =
             Create("a.tif", 23, 9, 2, eType, bSignedByte ? "PIXELTYPE=SIGNEDBYTE" : nullptr);
         std::vector<unsigned char> vbyBytes(
             static_cast<std::size_t>(23 * 9 * 2 * GDALGetDataTypeSizeBytes(eType)));
@@ -52,7 +52,7 @@ TEST_F(ToolTest, EveryTypeKeepsItsSamples) {
         ASSERT_EQ(poSource->RasterIO(GF_Write, 0, 0, 23, 9, vbyBytes.data(), 23, 9, eType, 2,
                                      nullptr, 0, 0, 0, nullptr),
                   CE_None);
-        poSource->FlushCache();
+        poSource.reset();
         Succeed("resample a.tif b.tif --scale 1 --method near -q");
         EXPECT_TRUE(ReadBytes("b.tif") == ReadBytes("a.tif")) << GDALGetDataTypeName(eType);
         const GDALDatasetUniquePtr poTarget = Open("b.tif");

@@ -10,7 +10,7 @@ namespace vetra::utils::engine {
 
 /// Pixels that go through the stages together; their arrays fit into the first-level cache. A
 /// multiple of kLanes, so that stages work on whole groups and never look at a rest.
-constexpr int kSpanPixels = 128;
+constexpr int kSpanPixels = 256;
 /// Pixels that the lane layer treats at once.
 constexpr int kLanes = 8;
 
