@@ -19,8 +19,8 @@ VETRA_EXPORT bool IsNumeric(const std::string& s);
 
 /// The number at the start of a text, read like `atof` in the C locale whatever locale the process
 /// has set: white space, sign, digits, point, exponent; 0.0 where no number starts. A D or d
-/// behind the digits counts as E, so that every text that `IsNumeric` accepts is read whole: "1.5D3" is 1500. A number beyond
-/// the range of double gives an infinity or 0.
+/// behind the digits counts as E, so that every text that `IsNumeric` accepts is read whole:
+/// "1.5D3" is 1500. A number beyond the range of double gives an infinity or 0.
 VETRA_EXPORT double TextToDouble(const std::string& s);
 
 #endif  // VETRA_BASE_UTILS_STRING_STRINGUTILS_H

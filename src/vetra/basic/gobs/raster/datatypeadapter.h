@@ -29,7 +29,7 @@ enum NativeDataTypeCode : int {
 
 /// Questions about a type code that is known only at run time.
 class VETRA_EXPORT DataTypeAdapter {
-   public:
+ public:
     /// Bytes of one sample of one channel, both parts of a complex sample together.
     /// \throws ParameterException for a code without a size: `eDT_C16U`, `eDT_UNKNOWN`, and any
     ///         value outside the enumeration.

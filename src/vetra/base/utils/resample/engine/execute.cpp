@@ -17,17 +17,14 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
-#include <vector>
 
+#include "vetra/base/utils/resample/engine/columntables.h"
 #include "vetra/base/utils/resample/engine/positions.h"
 #include "vetra/base/utils/resample/engine/task.h"
 
 namespace vetra::utils::engine {
 
 namespace {
-
-constexpr int kSpanArray = kSpanPixels + kLanes;
-constexpr int kSampleBytes[kNumSampleTypes] = {1, 1, 2, 2, 4, 4, 4, 8, 8, 8};
 
 // Sets of modes.
 constexpr unsigned kSetBackground = 1u << ePO_BACKGROUND;
@@ -86,35 +83,16 @@ unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
     return nModes;
 }
 
-// What an axis-aligned run tabulates per target column. The places of columns outside are 0.
-struct ColumnTables {
-    std::vector<double> vdfPosition;
-    std::vector<double> vdfFrac;
-    // Of windows and nearest pixels: source columns, and offsets of samples.
-    std::vector<std::int64_t> vnWindowCol;
-    std::vector<std::int64_t> vnNearestCol;
-    std::vector<std::int64_t> vnWindow;
-    std::vector<std::int64_t> vnNearest;
-    std::vector<unsigned char> vbyClass;
-    // Modes by the class of the row, where no mask has a say.
-    std::vector<unsigned char> avbyMode[4];
-    // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
-    std::vector<PairGroup> voGroups;
-};
-
 class Run {
  public:
     explicit Run(const Task& oTask);
 
     // Fills target pixels nBegin to nEnd - 1.
     void Walk(long long nBegin, long long nEnd) const {
-        moColumns.vdfPosition.empty() ? WalkGeneral(nBegin, nEnd) : WalkRows(nBegin, nEnd);
+        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd) : WalkRows(nBegin, nEnd);
     }
 
  private:
-    void MakeColumnTables();
-    void MakePairGroups();
-
     void WalkGeneral(long long nBegin, long long nEnd) const;
     void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
     // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
@@ -190,76 +168,7 @@ Run::Run(const Task& oTask)
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
         }
         if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
-            MakeColumnTables();
-            MakePairGroups();
-        }
-    }
-}
-
-void Run::MakeColumnTables() {
-    const int nCols = moTask.nTgtCols;
-    // Groups reach beyond the last column; the entries there are 0.
-    const std::size_t nSize = static_cast<std::size_t>(nCols) + kSpanArray;
-    moColumns.vdfPosition.resize(nSize);
-    moColumns.vdfFrac.resize(nSize);
-    moColumns.vnWindowCol.resize(nSize);
-    moColumns.vnNearestCol.resize(nSize);
-    moColumns.vbyClass.resize(nSize);
-    // Of the first source row, to which no window is tied: what remains is the column's part.
-    ClassLimits oLimits = moLimits;
-    oLimits.dfFitRowFirst = 0.0;
-    oLimits.dfFitRowLast = 0.0;
-    oLimits.dfRowOff = 0.0;
-    double adfRow[kSpanArray];
-    for (int nX = 0; nX < nCols; nX += kSpanPixels) {
-        const int nPix = std::min(kSpanPixels, nCols - nX);
-        double* padfCol = moColumns.vdfPosition.data() + nX;
-        moPositions.Fill(moStages, nX, nPix, padfCol, adfRow);
-        std::fill_n(adfRow, kSpanArray, 0.0);
-        moStages.pfnClasses(oLimits, moTask.nSrcCols, padfCol, adfRow, nPix,
-                            moColumns.vbyClass.data() + nX, moColumns.vnWindowCol.data() + nX,
-                            moColumns.vnNearestCol.data() + nX);
-    }
-    moColumns.vnWindow = moColumns.vnWindowCol;
-    moColumns.vnNearest = moColumns.vnNearestCol;
-    for (std::size_t i = 0; i < nSize; ++i) {
-        const double dfPosition = moColumns.vdfPosition[i];
-        moColumns.vdfFrac[i] =
-            dfPosition - std::floor(moLimits.bAnchorNearest ? dfPosition + 0.5 : dfPosition);
-        moColumns.vnWindow[i] *= moTask.nChan;
-        moColumns.vnNearest[i] *= moTask.nChan;
-    }
-    for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
-        auto& vbyMode = moColumns.avbyMode[nRowClass];
-        vbyMode.resize(nSize);
-        for (std::size_t i = 0; i < nSize; ++i) {
-            vbyMode[i] = moModes.Get(ePO_INTERPOLATED, moColumns.vbyClass[i] & nRowClass);
-        }
-    }
-}
-
-// The samples of eight neighbouring columns lie close together unless the scale is large: one load
-// and a shuffle replace eight loads.
-void Run::MakePairGroups() {
-    if (moMethod.papfnValues == nullptr || moMethod.oWindow.nCols != 2 || mnSrcBytes != 1 ||
-        moTask.nChan != 1 || mnPitch < PairGroup::kBytes) {
-        return;
-    }
-    moColumns.voGroups.resize(static_cast<std::size_t>(moTask.nTgtCols) / kLanes + 1);
-    for (std::size_t g = 0; g < moColumns.voGroups.size(); ++g) {
-        PairGroup& oGroup = moColumns.voGroups[g];
-        const std::int64_t* panOffset = moColumns.vnWindow.data() + g * kLanes;
-        const auto [itFirst, itLast] = std::minmax_element(panOffset, panOffset + kLanes);
-        // The load ends with the row at the latest, so it stays in the source.
-        oGroup.nOffset = std::min<std::int64_t>(*itFirst, mnPitch - PairGroup::kBytes);
-        if (*itLast + 1 - oGroup.nOffset >= PairGroup::kBytes) {
-            oGroup.nOffset = -1;
-            continue;
-        }
-        for (int i = 0; i < kLanes; ++i) {
-            const auto nPlace = static_cast<unsigned char>(panOffset[i] - oGroup.nOffset);
-            oGroup.abyPlace[i] = nPlace;
-            oGroup.abyPlace[kLanes + i] = static_cast<unsigned char>(nPlace + 1);
+            moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits, moModes);
         }
     }
 }

@@ -13,9 +13,12 @@ namespace vetra::utils::engine {
 constexpr int kSpanPixels = 256;
 /// Pixels that the lane layer treats at once.
 constexpr int kLanes = 8;
+/// Size of a span's arrays: stages may write up to the end of the last group.
+constexpr int kSpanArray = kSpanPixels + kLanes;
 
 /// The ten real sample types, by type code.
 constexpr int kNumSampleTypes = 10;
+constexpr int kSampleBytes[kNumSampleTypes] = {1, 1, 2, 2, 4, 4, 4, 8, 8, 8};
 
 /// Class bits of a position.
 constexpr unsigned char kClassFits = 1;  ///< the method's window lies inside the source

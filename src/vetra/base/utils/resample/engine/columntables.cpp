@@ -1,0 +1,87 @@
+#include "vetra/base/utils/resample/engine/columntables.h"
+
+#include <algorithm>
+#include <cmath>
+
+namespace vetra::utils::engine {
+
+namespace {
+
+// The samples of eight neighbouring columns lie close together unless the scale is large: one load
+// and a shuffle replace eight loads.
+std::vector<PairGroup> MakePairGroups(const Task& oTask, const ColumnTables& oColumns) {
+    const Method& oMethod = *oTask.poMethod;
+    if (oMethod.papfnValues == nullptr || oMethod.oWindow.nCols != 2 || oTask.nChan != 1 ||
+        kSampleBytes[oTask.nSrcType] != 1 || oTask.nSrcCols < PairGroup::kBytes) {
+        return {};
+    }
+    std::vector<PairGroup> voGroups(static_cast<std::size_t>(oTask.nTgtCols) / kLanes + 1);
+    const std::int64_t* panOffset = oColumns.vnWindow.data();
+    for (PairGroup& oGroup : voGroups) {
+        const auto [itFirst, itLast] = std::minmax_element(panOffset, panOffset + kLanes);
+        // The load ends with the row at the latest, so it stays in the source.
+        oGroup.nOffset = std::min<std::int64_t>(*itFirst, oTask.nSrcCols - PairGroup::kBytes);
+        if (*itLast + 1 - oGroup.nOffset >= PairGroup::kBytes) {
+            oGroup.nOffset = -1;
+        } else {
+            for (int i = 0; i < kLanes; ++i) {
+                const auto nPlace = static_cast<unsigned char>(panOffset[i] - oGroup.nOffset);
+                oGroup.abyPlace[i] = nPlace;
+                oGroup.abyPlace[kLanes + i] = static_cast<unsigned char>(nPlace + 1);
+            }
+        }
+        panOffset += kLanes;
+    }
+    return voGroups;
+}
+
+}  // namespace
+
+ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
+                              const Positions& oPositions, const ClassLimits& oLimits,
+                              const ModeTable& oModes) {
+    const int nCols = oTask.nTgtCols;
+    const std::size_t nSize = static_cast<std::size_t>(nCols) + kSpanArray;
+    ColumnTables oColumns;
+    oColumns.vdfFrac.resize(nSize);
+    oColumns.vnWindowCol.resize(nSize);
+    oColumns.vnNearestCol.resize(nSize);
+    oColumns.vbyClass.resize(nSize);
+    // Of the first source row, to which no window is tied: what remains is the column's part.
+    ClassLimits oFirstRow = oLimits;
+    oFirstRow.dfFitRowFirst = 0.0;
+    oFirstRow.dfFitRowLast = 0.0;
+    oFirstRow.dfRowOff = 0.0;
+    double adfCol[kSpanArray];
+    double adfRow[kSpanArray];
+    for (int nX = 0; nX < nCols; nX += kSpanPixels) {
+        const int nPix = std::min(kSpanPixels, nCols - nX);
+        oPositions.Fill(oStages, nX, nPix, adfCol, adfRow);
+        std::fill_n(adfRow, kSpanArray, 0.0);
+        oStages.pfnClasses(oFirstRow, oTask.nSrcCols, adfCol, adfRow, nPix,
+                           oColumns.vbyClass.data() + nX, oColumns.vnWindowCol.data() + nX,
+                           oColumns.vnNearestCol.data() + nX);
+        double* padfFrac = oColumns.vdfFrac.data() + nX;
+        for (int i = 0; i < nPix; ++i) {
+            padfFrac[i] =
+                adfCol[i] - std::floor(oLimits.bAnchorNearest ? adfCol[i] + 0.5 : adfCol[i]);
+        }
+    }
+    oColumns.vnWindow = oColumns.vnWindowCol;
+    oColumns.vnNearest = oColumns.vnNearestCol;
+    for (std::size_t i = 0; i < nSize; ++i) {
+        oColumns.vnWindow[i] *= oTask.nChan;
+        oColumns.vnNearest[i] *= oTask.nChan;
+    }
+    for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
+        auto& vbyMode = oColumns.avbyMode[nRowClass];
+        vbyMode.resize(nSize);
+        for (std::size_t i = 0; i < nSize; ++i) {
+            vbyMode[i] = oModes.Get(ePO_INTERPOLATED, oColumns.vbyClass[i] & nRowClass);
+        }
+    }
+    oColumns.voGroups = MakePairGroups(oTask, oColumns);
+    return oColumns;
+}
+
+}  // namespace vetra::utils::engine

@@ -1,0 +1,36 @@
+#ifndef VETRA_BASE_UTILS_RESAMPLE_ENGINE_COLUMNTABLES_H
+#define VETRA_BASE_UTILS_RESAMPLE_ENGINE_COLUMNTABLES_H
+
+#include <cstdint>
+#include <vector>
+
+#include "vetra/base/utils/resample/engine/positions.h"
+#include "vetra/base/utils/resample/engine/task.h"
+
+namespace vetra::utils::engine {
+
+/// What an axis-aligned run tabulates per target column, once. Places of columns outside the source
+/// are 0. All tables reach kSpanArray entries beyond the last column, so that groups of pixels can;
+/// the places there are inside the source too.
+struct ColumnTables {
+    std::vector<double> vdfFrac;
+    // Of windows and nearest pixels: source columns, and offsets of samples.
+    std::vector<std::int64_t> vnWindowCol;
+    std::vector<std::int64_t> vnNearestCol;
+    std::vector<std::int64_t> vnWindow;
+    std::vector<std::int64_t> vnNearest;
+    std::vector<unsigned char> vbyClass;
+    // Modes by the class of the row, where no mask has a say.
+    std::vector<unsigned char> avbyMode[4];
+    // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
+    std::vector<PairGroup> voGroups;
+};
+
+/// Throws std::bad_alloc.
+ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
+                              const Positions& oPositions, const ClassLimits& oLimits,
+                              const ModeTable& oModes);
+
+}  // namespace vetra::utils::engine
+
+#endif  // VETRA_BASE_UTILS_RESAMPLE_ENGINE_COLUMNTABLES_H
