@@ -7,6 +7,10 @@
 #include <cstdint>
 
 #include "vetra/base/utils/resample/algorithm/resamplebilinear.h"
+#include "vetra/base/utils/resample/algorithm/resamplecubic.h"
+#include "vetra/base/utils/resample/algorithm/resamplecubicps.h"
+#include "vetra/base/utils/resample/algorithm/resamplelagrange4.h"
+#include "vetra/base/utils/resample/algorithm/resamplelagrange8.h"
 #include "vetra/base/utils/resample/algorithm/resamplenearest.h"
 #include "vetra/base/utils/resample/engine/dispatch.h"
 #include "vetra/faultcore/exceptions.h"
@@ -112,13 +116,44 @@ void ResampleFunc(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPo
                                                      oResParms.mdfOutBgd,
                                                      oResParms.mbClampBgd,
                                                      oOptions};
+    const NodataFillAction eFillAction = oResParms.meNodataFillAction;
     ReadCoefficients(oResParms, oSrc.GetNumChan());
     switch (oResParms.meMethod) {
         case eRM_NEAR:
             ResampleNearest(oArgs);
             return;
+        case eRM_SQNEAR:
+            ResampleSqNearest(oArgs);
+            return;
         case eRM_BILIN:
-            ResampleBilinear(oArgs, oResParms.meNodataFillAction);
+            ResampleBilinear(oArgs, eFillAction);
+            return;
+        case eRM_SQBILIN:
+            ResampleSqBilinear(oArgs, eFillAction);
+            return;
+        case eRM_CUBIC:
+            ResampleCubic(oArgs, eFillAction);
+            return;
+        case eRM_SQCUBIC:
+            ResampleSqCubic(oArgs, eFillAction);
+            return;
+        case eRM_CUBICPS:
+            ResampleCubicPs(oArgs);
+            return;
+        case eRM_SQCUBICPS:
+            ResampleSqCubicPs(oArgs);
+            return;
+        case eRM_LAGRANGE4:
+            ResampleLagrange4(oArgs, eFillAction);
+            return;
+        case eRM_SQLAGRANGE4:
+            ResampleSqLagrange4(oArgs, eFillAction);
+            return;
+        case eRM_LAGRANGE8:
+            ResampleLagrange8(oArgs, eFillAction);
+            return;
+        case eRM_SQLAGRANGE8:
+            ResampleSqLagrange8(oArgs, eFillAction);
             return;
         default:
             RefuseMethod(oResParms.meMethod);

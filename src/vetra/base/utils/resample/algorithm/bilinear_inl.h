@@ -1,6 +1,8 @@
 // Bilinear interpolation. Included inside a level's namespace; see engine/stages_inl.h.
 
 struct Bilinear {
+    static constexpr int kSize = 2;
+
     // The value between the four samples around a position. The products are added in this order,
     // which is part of the result.
     template <typename Window>
@@ -10,9 +12,10 @@ struct Bilinear {
         const F64 w10 = (one - dy) * dx;
         const F64 w01 = (one - dx) * dy;
         const F64 w11 = dy * dx;
-        F64 p00, p10, p01, p11;
-        oWindow.Pair(0, p00, p10);
-        oWindow.Pair(1, p01, p11);
-        return p10 * w10 + p00 * w00 + p01 * w01 + p11 * w11;
+        F64 upper[2];
+        F64 lower[2];
+        oWindow.Row(0, upper);
+        oWindow.Row(1, lower);
+        return upper[1] * w10 + upper[0] * w00 + lower[0] * w01 + lower[1] * w11;
     }
 };

@@ -11,4 +11,11 @@ void ResampleBilinear(const vetra::utils::engine::SamplingArguments<Tin, Tout>& 
     vetra::utils::engine::Sample(oArgs, vetra::utils::engine::kBilinearMethod, eFillAction);
 }
 
+/// As its plain twin, on the square roots of the samples, with the result squared.
+template <typename Tin, typename Tout>
+void ResampleSqBilinear(const vetra::utils::engine::SamplingArguments<Tin, Tout>& oArgs,
+                        vetra::utils::NodataFillAction eFillAction) {
+    vetra::utils::engine::Sample(oArgs, vetra::utils::engine::kSqBilinearMethod, eFillAction);
+}
+
 #endif  // VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLEBILINEAR_H

@@ -11,7 +11,7 @@ namespace {
 // and a shuffle replace eight loads.
 std::vector<PairGroup> MakePairGroups(const Task& oTask, const ColumnTables& oColumns) {
     const Method& oMethod = *oTask.poMethod;
-    if (oMethod.papfnValues == nullptr || oMethod.oWindow.nCols != 2 || oTask.nChan != 1 ||
+    if (oMethod.eValues == eVR_NONE || oMethod.oWindow.nCols != 2 || oTask.nChan != 1 ||
         kSampleBytes[oTask.nSrcType] != 1 || oTask.nSrcCols < PairGroup::kBytes) {
         return {};
     }

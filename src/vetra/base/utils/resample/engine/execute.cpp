@@ -45,7 +45,7 @@ struct Span {
     const std::int64_t* panNearest = nullptr;
     const double* padfFracCol = nullptr;
     const double* padfFracRow = nullptr;
-    bool bOneRow = false;
+    const unsigned char* pabyWindowMask = nullptr;
     const PairGroup* poGroups = nullptr;
 
     const unsigned char* ModesUnless(unsigned nSet) const {
@@ -152,7 +152,7 @@ Run::Run(const Task& oTask)
     moLimits.dfFitRowFirst = -static_cast<double>(oWindow.nRowOff);
     moLimits.dfFitColLast = static_cast<double>(oTask.nSrcCols) - oWindow.nCols - oWindow.nColOff;
     moLimits.dfFitRowLast = static_cast<double>(oTask.nSrcRows) - oWindow.nRows - oWindow.nRowOff;
-    if (moMethod.papfnValues == nullptr) {
+    if (moMethod.eValues == eVR_NONE) {
         moLimits.dfFitColLast = moLimits.dfFitColFirst - 1.0;  // nothing to fit
     }
     moLimits.dfNearColLast = oTask.nSrcCols - 1.0;
@@ -162,9 +162,9 @@ Run::Run(const Task& oTask)
     moLimits.dfRowOff = oWindow.nRowOff;
 
     const bool bNearest = moMethod.eRule == ModeRule::eNearestSample;
-    mnFallback = bNearest || oTask.eFillAction != eNFA_BGD ? ePO_NEAREST : ePO_BACKGROUND;
+    mnFallback = moModes.Get(ePO_INTERPOLATED, kClassNear);
     if (oTask.oOptions.bShortcuts) {
-        if (bNearest && oTask.nSrcType == oTask.nTgtType) {
+        if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
         }
         if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
@@ -189,6 +189,7 @@ void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
     oSpan.pabyMode = oArrays.abyMode;
     oSpan.pWindowSrc = static_cast<const char*>(moTask.pSrc);
     oSpan.pNearestSrc = oSpan.pWindowSrc;
+    oSpan.pabyWindowMask = moTask.pabySrcMask;
     oSpan.panWindow = oArrays.anWindow;
     oSpan.panNearest = oArrays.anNearest;
     oSpan.padfFracCol = oArrays.adfFracCol;
@@ -196,7 +197,7 @@ void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
 
     moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
     if (mbOpen) {
-        oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.papfnValues != nullptr, mnFallback,
+        oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.eValues != eVR_NONE, mnFallback,
                                              oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
     } else {
         moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
@@ -247,9 +248,11 @@ void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
                       long long nNearestShift, unsigned char* pabyClassThenMode) const {
     if (moTask.pabySrcMask != nullptr) {
         const Window& oWindow = moMethod.oWindow;
+        // The other rules look at the nearest pixel alone, whose byte only has to differ from 0.
+        const bool bWholeWindow = moMethod.eRule == ModeRule::eWindow;
         moStages.pfnMaskClasses(
             {moTask.pabySrcMask + nWindowShift, moTask.pabySrcMask + nNearestShift, moTask.nSrcCols,
-             oWindow.nCols, oWindow.nRows, moMethod.eRule != ModeRule::eNearestSample},
+             oWindow.nCols, bWholeWindow ? oWindow.nRows : 0, bWholeWindow},
             panWindow, panNearest, nPix, pabyClassThenMode);
     }
     // A copy that no store can reach, so that it needs no reading again.
@@ -295,14 +298,18 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         static_cast<unsigned char>((bFits ? kClassFits : 0) | (bNear ? kClassNear : 0));
 
     Span oSpan;
-    oSpan.bOneRow = true;
-    oSpan.padfFracRow = &dfFracRow;
+    double adfFracRow[kSpanArray];
+    std::fill_n(adfFracRow, std::min(nNumCols + kLanes, kSpanArray), dfFracRow);
+    oSpan.padfFracRow = adfFracRow;
     // Rows outside have no samples: no pixel of theirs has a mode that reads any.
     const long long nWindowRow =
         bFits ? static_cast<long long>(dfAnchorRow) + moMethod.oWindow.nRowOff : 0;
     const long long nNearestRow = bNear ? static_cast<long long>(dfNearRow) : 0;
     oSpan.pWindowSrc = SrcRow(nWindowRow);
     oSpan.pNearestSrc = SrcRow(nNearestRow);
+    if (moTask.pabySrcMask != nullptr) {
+        oSpan.pabyWindowMask = moTask.pabySrcMask + nWindowRow * moTask.nSrcCols;
+    }
     alignas(64) unsigned char abyMode[kSpanArray];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
         const std::size_t nCol = static_cast<std::size_t>(nFirstCol + nDone);
@@ -358,18 +365,20 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.nPix = oSpan.nPix;
     oWindows.nPitch = mnPitch;
     oWindows.nChan = moTask.nChan;
-    oWindows.bOneRow = oSpan.bOneRow;
+    oWindows.pabyMask = oSpan.pabyWindowMask;
     oWindows.poGroups = oSpan.poGroups;
+    const auto& apfnNearest =
+        moMethod.bNonNegative ? moStages.apfnNonNegativeNearest : moStages.apfnNearest;
     for (int nChannel = 0; nChannel < moTask.nChan; ++nChannel) {
         const std::ptrdiff_t nShift = static_cast<std::ptrdiff_t>(nChannel) * mnSrcBytes;
         if (bWindows) {
-            (moStages.*moMethod.papfnValues)[moTask.nSrcType](oWindows, oSpan.pWindowSrc + nShift,
-                                                              moTask.pParameters, oValues.adfValue);
+            moStages.apfnValues[moMethod.eValues][moTask.nSrcType](
+                oWindows, oSpan.pWindowSrc + nShift, moTask.pParameters, oValues.adfValue);
         }
         if (bNearest) {
-            moStages.apfnNearest[moTask.nSrcType](oSpan.pNearestSrc + nShift, oSpan.panNearest,
-                                                  oSpan.ModesUnless(kSetNearest), oSpan.nPix,
-                                                  oValues.adfValue);
+            apfnNearest[moTask.nSrcType](oSpan.pNearestSrc + nShift, oSpan.panNearest,
+                                         oSpan.ModesUnless(kSetNearest), oSpan.nPix,
+                                         oValues.adfValue);
         }
         moStages.apfnStore[moTask.nTgtType](oValues.adfValue, oSpan.nPix, moTask.pLimits,
                                             oValues.abySample);

@@ -56,6 +56,8 @@ inline F64 Abs(F64 a) {
     return {_mm256_andnot_pd(vSign, a.lo), _mm256_andnot_pd(vSign, a.hi)};
 }
 
+inline F64 Sqrt(F64 a) { return {_mm256_sqrt_pd(a.lo), _mm256_sqrt_pd(a.hi)}; }
+
 inline unsigned Bits(B64 b) {
     return static_cast<unsigned>(_mm256_movemask_pd(b.lo) | _mm256_movemask_pd(b.hi) << 4);
 }

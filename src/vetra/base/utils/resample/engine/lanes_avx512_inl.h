@@ -31,6 +31,8 @@ inline F64 RoundEven(F64 a) {
 }
 inline F64 Abs(F64 a) { return {_mm512_andnot_pd(_mm512_set1_pd(-0.0), a.v)}; }
 
+inline F64 Sqrt(F64 a) { return {_mm512_sqrt_pd(a.v)}; }
+
 inline unsigned Bits(B64 b) { return b.m; }
 inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
     const __mmask16 m = _mm_cmpeq_epi8_mask(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),

@@ -91,6 +91,13 @@ inline F64 Floor(F64 a) {
     return Select(rounded > a, rounded - Set1(1.0), rounded);
 }
 
+inline F64 Sqrt(F64 a) {
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = Pair{__builtin_sqrt(a.v[i][0]), __builtin_sqrt(a.v[i][1])};
+    }
+    return a;
+}
+
 inline unsigned Bits(B64 b) {
     unsigned nBits = 0;
     for (int i = 0; i < kParts; ++i) {

@@ -5,10 +5,32 @@
 
 namespace vetra::utils::engine {
 
-/// The methods, as the sampling loop sees them.
-inline constexpr Method kNearestMethod{ModeRule::eNearestSample, Window{0, 0, 1, 1, true}, nullptr};
-inline constexpr Method kBilinearMethod{ModeRule::eWindow, Window{0, 0, 2, 2, false},
-                                        &LevelStages::apfnBilinear};
+/// The window of a method of nSize x nSize pixels around the position.
+constexpr Window SquareWindow(int nSize) {
+    return {1 - nSize / 2, 1 - nSize / 2, nSize, nSize, false};
+}
+
+/// The methods, as the sampling loop sees them. A squared twin differs in the samples that it
+/// reads.
+inline constexpr Method kNearestMethod{
+    ModeRule::eNearestSample, {0, 0, 1, 1, true}, eVR_NONE, false};
+inline constexpr Method kBilinearMethod{ModeRule::eWindow, SquareWindow(2), eVR_BILINEAR, false};
+inline constexpr Method kCubicMethod{ModeRule::eWindow, SquareWindow(4), eVR_CUBIC, false};
+inline constexpr Method kCubicPsMethod{ModeRule::eReplacingWindow, SquareWindow(4), eVR_CUBICPS,
+                                       false};
+inline constexpr Method kLagrange4Method{ModeRule::eWindow, SquareWindow(4), eVR_LAGRANGE4, false};
+inline constexpr Method kLagrange8Method{ModeRule::eWindow, SquareWindow(8), eVR_LAGRANGE8, false};
+
+inline constexpr Method kSqNearestMethod{
+    ModeRule::eNearestSample, {0, 0, 1, 1, true}, eVR_NONE, true};
+inline constexpr Method kSqBilinearMethod{ModeRule::eWindow, SquareWindow(2), eVR_SQBILINEAR, true};
+inline constexpr Method kSqCubicMethod{ModeRule::eWindow, SquareWindow(4), eVR_SQCUBIC, true};
+inline constexpr Method kSqCubicPsMethod{ModeRule::eReplacingWindow, SquareWindow(4), eVR_SQCUBICPS,
+                                         true};
+inline constexpr Method kSqLagrange4Method{ModeRule::eWindow, SquareWindow(4), eVR_SQLAGRANGE4,
+                                           true};
+inline constexpr Method kSqLagrange8Method{ModeRule::eWindow, SquareWindow(8), eVR_SQLAGRANGE8,
+                                           true};
 
 }  // namespace vetra::utils::engine
 

@@ -8,7 +8,10 @@ namespace vetra::utils::engine {
 
 /// How a method decides what becomes of a pixel.
 enum class ModeRule {
-    eWindow,         ///< as `ChooseResampleMode` and `ChooseResampleModeForFilter`
+    eWindow,  ///< as `ChooseResampleMode` and `ChooseResampleModeForFilter`
+    /// The window has to lie inside the source and the nearest pixel has to be valid (its mask byte
+    /// isn't 0); else the background, whatever is requested.
+    eReplacingWindow,
     eNearestSample,  ///< no window: the nearest sample, valid while its mask byte isn't 0
 };
 
@@ -50,6 +53,12 @@ class ModeTable {
                                 unsigned char nRequest, unsigned char nClass) {
         const bool bWhole = (nClass & kClassFits) != 0;
         const bool bUsable = (nClass & kClassNear) != 0;
+        if (eRule == ModeRule::eReplacingWindow) {
+            if (!bWhole || !bUsable) {
+                return ePO_BACKGROUND;
+            }
+            return nRequest <= ePO_UNTOUCHED ? nRequest : static_cast<unsigned char>(ePO_UNTOUCHED);
+        }
         if (nRequest == ePO_BACKGROUND || nRequest == ePO_UNTOUCHED) {
             return nRequest;
         }

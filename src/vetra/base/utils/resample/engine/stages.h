@@ -73,6 +73,8 @@ struct WindowSpan {
     /// Position minus anchor.
     const double* padfFracCol;
     const double* padfFracRow;
+    /// The source mask, from the pixel to which offset 0 leads, or null.
+    const unsigned char* pabyMask;
     /// Modes of the pixels, when others than 1 occur, else null.
     const unsigned char* pabyMode;
     int nPix;
@@ -80,8 +82,6 @@ struct WindowSpan {
     std::int64_t nPitch;
     /// Samples from a pixel to the next.
     int nChan;
-    /// All pixels share the first row fraction: the transform is axis-aligned.
-    bool bOneRow;
     /// Of each eight pixels, for 8-bit samples and windows of two columns in an axis-aligned run of
     /// one channel; else null.
     const PairGroup* poGroups;
@@ -113,6 +113,23 @@ using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, i
                               void* pTgt);
 /// Clamps samples of an integer type in place.
 using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void* pLimits);
+
+/// The ways of making a value out of a window, each a row of a level's table. The squared ones work
+/// on the roots of the samples.
+enum ValuesRow : int {
+    eVR_BILINEAR,
+    eVR_CUBIC,
+    eVR_CUBICPS,
+    eVR_LAGRANGE4,
+    eVR_LAGRANGE8,
+    eVR_SQBILINEAR,
+    eVR_SQCUBIC,
+    eVR_SQCUBICPS,
+    eVR_SQLAGRANGE4,
+    eVR_SQLAGRANGE8,
+    kNumValues,
+    eVR_NONE = -1,  ///< for a method without a window
+};
 
 /// The stages of one processor level.
 struct LevelStages {
@@ -155,8 +172,10 @@ struct LevelStages {
                              std::int64_t* panOffset);
 
     // Values and stores, by sample type.
-    ValuesFunction apfnBilinear[kNumSampleTypes];
+    ValuesFunction apfnValues[kNumValues][kNumSampleTypes];
     NearestFunction apfnNearest[kNumSampleTypes];
+    /// With 0 in the place of negative samples.
+    NearestFunction apfnNonNegativeNearest[kNumSampleTypes];
     StoreFunction apfnStore[kNumSampleTypes];
     /// Null for the types whose samples may change on their way through a double.
     CopyFunction apfnCopy[kNumSampleTypes];

@@ -10,7 +10,7 @@
 //   F64, B64                     eight doubles; eight truth values
 //   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
-//   Floor RoundEven Abs          RoundEven: to nearest, ties to even
+//   Floor RoundEven Abs Sqrt     RoundEven: to nearest, ties to even
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
@@ -264,17 +264,34 @@ template <typename T, bool kSingleChannel>
 struct WindowReader {
     const T* pFirst;
     const std::int64_t* panOffset;
-    std::int64_t nPitch;
-    int nChan;
+    const WindowSpan& oSpan;
 
-    // The first two samples of window row nRow.
-    void Pair(int nRow, F64& a, F64& b) const {
-        const T* p = pFirst + nRow * nPitch;
-        if constexpr (kSingleChannel) {
-            GatherPair(p, panOffset, a, b);
-        } else {
-            a = Gather(p, panOffset);
-            b = Gather(p + nChan, panOffset);
+    // The first N samples of window row nRow.
+    template <int N>
+    void Row(int nRow, F64 (&p)[N]) const {
+        const T* pRow = pFirst + nRow * oSpan.nPitch;
+        for (int j = 0; j < N; j += 2) {
+            if constexpr (kSingleChannel) {
+                GatherPair(pRow + j, panOffset, p[j], p[j + 1]);
+            } else {
+                p[j] = Gather(pRow + j * oSpan.nChan, panOffset);
+                p[j + 1] = Gather(pRow + (j + 1) * oSpan.nChan, panOffset);
+            }
+        }
+    }
+
+    bool HasMask() const { return oSpan.pabyMask != nullptr; }
+
+    // The mask bytes of the same samples.
+    template <int N>
+    void MaskRow(int nRow, F64 (&p)[N]) const {
+        std::int64_t anPixel[kLanes];
+        for (int i = 0; i < kLanes; ++i) {
+            anPixel[i] = panOffset[i] / oSpan.nChan;
+        }
+        const unsigned char* pabyRow = oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan);
+        for (int j = 0; j < N; ++j) {
+            p[j] = Gather(pabyRow + j, anPixel);
         }
     }
 };
@@ -286,23 +303,59 @@ struct GroupReader {
     const PairGroup* poGroup;
     std::int64_t nPitch;
 
-    void Pair(int nRow, F64& a, F64& b) const {
-        ShufflePairs(pFirst + nRow * nPitch + poGroup->nOffset, poGroup->abyPlace, a, b);
+    void Row(int nRow, F64 (&p)[2]) const {
+        ShufflePairs(pFirst + nRow * nPitch + poGroup->nOffset, poGroup->abyPlace, p[0], p[1]);
     }
 };
 
-template <typename Method, typename T, bool kSingleChannel, bool kOneRow>
+// The square root of a sample that is greater than 0; 0 for every other one, NaN included.
+inline F64 Root(F64 sample) {
+    const F64 zero = Set1(0.0);
+    return Select(sample > zero, Sqrt(sample), zero);
+}
+
+// Windows of roots.
+template <typename Window>
+struct RootReader {
+    const Window& oWindow;
+
+    template <int N>
+    void Row(int nRow, F64 (&p)[N]) const {
+        oWindow.Row(nRow, p);
+        for (int j = 0; j < N; ++j) {
+            p[j] = Root(p[j]);
+        }
+    }
+    bool HasMask() const { return oWindow.HasMask(); }
+    template <int N>
+    void MaskRow(int nRow, F64 (&p)[N]) const {
+        oWindow.MaskRow(nRow, p);
+    }
+};
+
+// A method on the roots of the samples, its value squared.
+template <typename Method>
+struct Squared {
+    static constexpr int kSize = Method::kSize;
+
+    template <typename Window>
+    static F64 Value(const Window& oWindow, F64 dx, F64 dy) {
+        const F64 value = Method::Value(RootReader<Window>{oWindow}, dx, dy);
+        return value * value;
+    }
+};
+
+template <typename Method, typename T, bool kSingleChannel>
 void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
     for (int i = 0; i < oSpan.nPix; i += kLanes) {
         if (oSpan.pabyMode != nullptr && !AnyByteEquals(oSpan.pabyMode + i, 1)) {
             continue;
         }
         const F64 dx = Load(oSpan.padfFracCol + i);
-        const F64 dy = kOneRow ? Set1(oSpan.padfFracRow[0]) : Load(oSpan.padfFracRow + i);
-        const WindowReader<T, kSingleChannel> oWindow{pSrc, oSpan.panOffset + i, oSpan.nPitch,
-                                                      oSpan.nChan};
+        const F64 dy = Load(oSpan.padfFracRow + i);
+        const WindowReader<T, kSingleChannel> oWindow{pSrc, oSpan.panOffset + i, oSpan};
         F64 value;
-        if constexpr (sizeof(T) == 1 && kSingleChannel && kOneRow) {
+        if constexpr (sizeof(T) == 1 && kSingleChannel && Method::kSize == 2) {
             const PairGroup* poGroup =
                 oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
             value = poGroup != nullptr && poGroup->nOffset >= 0
@@ -323,34 +376,32 @@ void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
 template <typename Method, typename T>
 void Values(const WindowSpan& oSpan, const void* pSrc, const void*, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
-    if (oSpan.nChan == 1) {
-        oSpan.bOneRow ? ValuesLoop<Method, T, true, true>(oSpan, p, padfValue)
-                      : ValuesLoop<Method, T, true, false>(oSpan, p, padfValue);
-    } else {
-        oSpan.bOneRow ? ValuesLoop<Method, T, false, true>(oSpan, p, padfValue)
-                      : ValuesLoop<Method, T, false, false>(oSpan, p, padfValue);
-    }
+    oSpan.nChan == 1 ? ValuesLoop<Method, T, true>(oSpan, p, padfValue)
+                     : ValuesLoop<Method, T, false>(oSpan, p, padfValue);
 }
 
-template <typename T>
+template <typename T, bool kNonNegative>
 void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsigned char* pabyMode,
                    int nPix, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
-    if (pabyMode == nullptr) {
-        for (int i = 0; i < nPix; i += kLanes) {
-            Store(padfValue + i, Gather(p, panOffset + i));
-        }
-        return;
-    }
+    const auto fnNearest = [&](int i) {
+        const F64 zero = Set1(0.0);
+        const F64 sample = Gather(p, panOffset + i);
+        return kNonNegative ? Select(zero > sample, zero, sample) : sample;
+    };
     for (int i = 0; i < nPix; i += kLanes) {
-        if (AnyByteEquals(pabyMode + i, 2)) {
-            const F64 nearest = Gather(p, panOffset + i);
-            Store(padfValue + i, Select(BytesEqual(pabyMode + i, 2), nearest, Load(padfValue + i)));
+        if (pabyMode == nullptr) {
+            Store(padfValue + i, fnNearest(i));
+        } else if (AnyByteEquals(pabyMode + i, 2)) {
+            Store(padfValue + i,
+                  Select(BytesEqual(pabyMode + i, 2), fnNearest(i), Load(padfValue + i)));
         }
     }
 }
 
 #include "vetra/base/utils/resample/algorithm/bilinear_inl.h"
+#include "vetra/base/utils/resample/algorithm/cubic_inl.h"
+#include "vetra/base/utils/resample/algorithm/lagrange_inl.h"
 
 // ---- Stores ----
 
@@ -480,7 +531,17 @@ void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
             Function(unsigned int), Function(int), nullptr, nullptr, nullptr, nullptr              \
     }
 #define VETRA_BILINEAR(T) &Values<Bilinear, T>
-#define VETRA_NEAREST(T) &NearestValues<T>
+#define VETRA_CUBIC(T) &Values<Cubic, T>
+#define VETRA_CUBICPS(T) &Values<CubicPs, T>
+#define VETRA_LAGRANGE4(T) &Values<Lagrange<LagrangeBasis4>, T>
+#define VETRA_LAGRANGE8(T) &Values<Lagrange<LagrangeBasis8>, T>
+#define VETRA_SQBILINEAR(T) &Values<Squared<Bilinear>, T>
+#define VETRA_SQCUBIC(T) &Values<Squared<Cubic>, T>
+#define VETRA_SQCUBICPS(T) &Values<Squared<CubicPs>, T>
+#define VETRA_SQLAGRANGE4(T) &Values<Squared<Lagrange<LagrangeBasis4>>, T>
+#define VETRA_SQLAGRANGE8(T) &Values<Squared<Lagrange<LagrangeBasis8>>, T>
+#define VETRA_NEAREST(T) &NearestValues<T, false>
+#define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
 #define VETRA_COPY(T) &CopyPixels<T>
 #define VETRA_CLAMP(T) &ClampSamples<T>
@@ -498,8 +559,20 @@ const LevelStages kStages = {
     &OpenModes,
     &Windows,
     &NearestPlaces,
-    VETRA_PER_TYPE(VETRA_BILINEAR),
+    {
+        VETRA_PER_TYPE(VETRA_BILINEAR),
+        VETRA_PER_TYPE(VETRA_CUBIC),
+        VETRA_PER_TYPE(VETRA_CUBICPS),
+        VETRA_PER_TYPE(VETRA_LAGRANGE4),
+        VETRA_PER_TYPE(VETRA_LAGRANGE8),
+        VETRA_PER_TYPE(VETRA_SQBILINEAR),
+        VETRA_PER_TYPE(VETRA_SQCUBIC),
+        VETRA_PER_TYPE(VETRA_SQCUBICPS),
+        VETRA_PER_TYPE(VETRA_SQLAGRANGE4),
+        VETRA_PER_TYPE(VETRA_SQLAGRANGE8),
+    },
     VETRA_PER_TYPE(VETRA_NEAREST),
+    VETRA_PER_TYPE(VETRA_NONNEGATIVE),
     VETRA_PER_TYPE(VETRA_STORE),
     VETRA_PER_SHORT_INTEGER(VETRA_COPY),
     VETRA_PER_SHORT_INTEGER(VETRA_CLAMP),

@@ -12,8 +12,9 @@ namespace vetra::utils::engine {
 struct Method {
     ModeRule eRule;
     Window oWindow;
-    /// Null for a method without a window.
-    ValuesFunction (LevelStages::*papfnValues)[kNumSampleTypes];
+    ValuesRow eValues;
+    /// Negative nearest samples count as 0.
+    bool bNonNegative;
 };
 
 /// What a run can be asked for beyond its result. The defaults are what every caller gets; tests
