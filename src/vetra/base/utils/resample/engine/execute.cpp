@@ -299,7 +299,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
 
     Span oSpan;
     double adfFracRow[kSpanArray];
-    std::fill_n(adfFracRow, std::min(nNumCols + kLanes, kSpanArray), dfFracRow);
+    std::fill_n(adfFracRow, std::min(nNumCols, kSpanPixels) + kLanes, dfFracRow);
     oSpan.padfFracRow = adfFracRow;
     // Rows outside have no samples: no pixel of theirs has a mode that reads any.
     const long long nWindowRow =

@@ -1,6 +1,7 @@
 #include "vetra/base/utils/resample/engine/positions.h"
 
 #include <algorithm>
+#include <limits>
 #include <typeinfo>
 
 #include "vetra/base/utils/resample/postfm/bufposarraytfm.h"
@@ -40,6 +41,11 @@ Positions::Positions(const IBufPosTfm& oTfm)
         moCorners.nRows = poBilinear->GetNumRows();
     } else if (ExactCast<BufPosScaleOffTfm>(*mpoWhole) != nullptr) {
         meKind = Kind::eScaleOff;
+    } else if (mpoWhole == &oTfm) {
+        // A caller's transform is asked by the flat index; what it says of its columns doesn't
+        // matter.
+        mnWholeCols = std::numeric_limits<int>::max();
+        moPart.nCols = mnWholeCols;
     }
 }
 
