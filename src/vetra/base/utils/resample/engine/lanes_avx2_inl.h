@@ -39,6 +39,10 @@ inline F64 Select(B64 m, F64 a, F64 b) {
     return {_mm256_blendv_pd(b.lo, a.lo, m.lo), _mm256_blendv_pd(b.hi, a.hi, m.hi)};
 }
 
+inline F64 ZeroWhere(B64 m, F64 a) {
+    return {_mm256_andnot_pd(m.lo, a.lo), _mm256_andnot_pd(m.hi, a.hi)};
+}
+
 inline F64 Set1(double df) { return {_mm256_set1_pd(df), _mm256_set1_pd(df)}; }
 inline F64 Load(const double* p) { return {_mm256_loadu_pd(p), _mm256_loadu_pd(p + 4)}; }
 inline void Store(double* p, F64 a) {

@@ -19,6 +19,10 @@ inline B64 operator==(F64 a, F64 b) { return {_mm512_cmp_pd_mask(a.v, b.v, _CMP_
 inline B64 operator&(B64 a, B64 b) { return {static_cast<__mmask8>(a.m & b.m)}; }
 inline F64 Select(B64 m, F64 a, F64 b) { return {_mm512_mask_blend_pd(m.m, b.v, a.v)}; }
 
+inline F64 ZeroWhere(B64 m, F64 a) {
+    return {_mm512_maskz_mov_pd(static_cast<__mmask8>(~m.m), a.v)};
+}
+
 inline F64 Set1(double df) { return {_mm512_set1_pd(df)}; }
 inline F64 Load(const double* p) { return {_mm512_loadu_pd(p)}; }
 inline void Store(double* p, F64 a) { _mm512_storeu_pd(p, a.v); }

@@ -46,6 +46,13 @@ inline F64 Select(B64 m, F64 a, F64 b) {
     return a;
 }
 
+inline F64 ZeroWhere(B64 m, F64 a) {
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = reinterpret_cast<Pair>(reinterpret_cast<PairMask>(a.v[i]) & ~m.m[i]);
+    }
+    return a;
+}
+
 inline F64 Set1(double df) {
     const Pair v{df, df};
     return {{v, v, v, v}};

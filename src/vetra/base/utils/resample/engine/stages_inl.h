@@ -9,6 +9,7 @@
 // offers
 //   F64, B64                     eight doubles; eight truth values
 //   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
+//   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Abs Sqrt     RoundEven: to nearest, ties to even
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
@@ -385,9 +386,9 @@ void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsign
                    int nPix, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
     const auto fnNearest = [&](int i) {
-        const F64 zero = Set1(0.0);
         const F64 sample = Gather(p, panOffset + i);
-        return kNonNegative ? Select(zero > sample, zero, sample) : sample;
+        // Not as a Select: Clang 14 makes a maximum of that which takes the sign of -0.0 away.
+        return kNonNegative ? ZeroWhere(Set1(0.0) > sample, sample) : sample;
     };
     for (int i = 0; i < nPix; i += kLanes) {
         if (pabyMode == nullptr) {
