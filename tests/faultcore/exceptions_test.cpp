@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 
 #include <type_traits>
+#include <utility>
 #include <vector>
 
 namespace vetra {
@@ -84,4 +85,11 @@ TEST(Exceptions, CopyKeepsAllPartsBeyondItsSource) {
 }
 
 }  // namespace
+TEST(Exceptions, KeepTheirTextsWhenMovedFrom) {
+    Exception oFrom("message", "file.cpp", "void f()", 7);
+    const Exception oTo = std::move(oFrom);
+    EXPECT_STREQ(oTo.what(), oFrom.what());
+    EXPECT_EQ("message", oFrom.GetMessage());
+}
+
 }  // namespace vetra
