@@ -55,11 +55,6 @@ inline F64 RoundEven(F64 a) {
     constexpr int nMode = _MM_FROUND_TO_NEAREST_INT | _MM_FROUND_NO_EXC;
     return {_mm256_round_pd(a.lo, nMode), _mm256_round_pd(a.hi, nMode)};
 }
-inline F64 Abs(F64 a) {
-    const __m256d vSign = _mm256_set1_pd(-0.0);
-    return {_mm256_andnot_pd(vSign, a.lo), _mm256_andnot_pd(vSign, a.hi)};
-}
-
 inline F64 Sqrt(F64 a) { return {_mm256_sqrt_pd(a.lo), _mm256_sqrt_pd(a.hi)}; }
 
 inline unsigned Bits(B64 b) {

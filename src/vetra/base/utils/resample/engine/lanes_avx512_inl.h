@@ -33,7 +33,6 @@ inline F64 Floor(F64 a) {
 inline F64 RoundEven(F64 a) {
     return {_mm512_roundscale_pd(a.v, _MM_FROUND_TO_NEAREST_INT | _MM_FROUND_NO_EXC)};
 }
-inline F64 Abs(F64 a) { return {_mm512_andnot_pd(_mm512_set1_pd(-0.0), a.v)}; }
 
 inline F64 Sqrt(F64 a) { return {_mm512_sqrt_pd(a.v)}; }
 

@@ -75,13 +75,6 @@ inline Pair WithSignOf(Pair a, Pair sign) {
                                   reinterpret_cast<PairMask>(SignPart(sign, true)));
 }
 
-inline F64 Abs(F64 a) {
-    for (int i = 0; i < kParts; ++i) {
-        a.v[i] = SignPart(a.v[i], false);
-    }
-    return a;
-}
-
 // Adding 2^52 to a smaller number rounds it to a whole one, to nearest, ties to even; greater
 // numbers, infinities and NaN are whole already. The sign is kept, that of zeros too.
 inline F64 RoundEven(F64 a) {

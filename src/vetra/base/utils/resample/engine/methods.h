@@ -21,16 +21,19 @@ inline constexpr Method kCubicPsMethod{ModeRule::eReplacingWindow, SquareWindow(
 inline constexpr Method kLagrange4Method{ModeRule::eWindow, SquareWindow(4), eVR_LAGRANGE4, false};
 inline constexpr Method kLagrange8Method{ModeRule::eWindow, SquareWindow(8), eVR_LAGRANGE8, false};
 
-inline constexpr Method kSqNearestMethod{
-    ModeRule::eNearestSample, {0, 0, 1, 1, true}, eVR_NONE, true};
-inline constexpr Method kSqBilinearMethod{ModeRule::eWindow, SquareWindow(2), eVR_SQBILINEAR, true};
-inline constexpr Method kSqCubicMethod{ModeRule::eWindow, SquareWindow(4), eVR_SQCUBIC, true};
-inline constexpr Method kSqCubicPsMethod{ModeRule::eReplacingWindow, SquareWindow(4), eVR_SQCUBICPS,
-                                         true};
-inline constexpr Method kSqLagrange4Method{ModeRule::eWindow, SquareWindow(4), eVR_SQLAGRANGE4,
-                                           true};
-inline constexpr Method kSqLagrange8Method{ModeRule::eWindow, SquareWindow(8), eVR_SQLAGRANGE8,
-                                           true};
+/// A method on the roots of the samples: its own row of values, and no negative nearest samples.
+constexpr Method SquaredTwin(Method oPlain, ValuesRow eValues) {
+    oPlain.eValues = eValues;
+    oPlain.bNonNegative = true;
+    return oPlain;
+}
+
+inline constexpr Method kSqNearestMethod = SquaredTwin(kNearestMethod, eVR_NONE);
+inline constexpr Method kSqBilinearMethod = SquaredTwin(kBilinearMethod, eVR_SQBILINEAR);
+inline constexpr Method kSqCubicMethod = SquaredTwin(kCubicMethod, eVR_SQCUBIC);
+inline constexpr Method kSqCubicPsMethod = SquaredTwin(kCubicPsMethod, eVR_SQCUBICPS);
+inline constexpr Method kSqLagrange4Method = SquaredTwin(kLagrange4Method, eVR_SQLAGRANGE4);
+inline constexpr Method kSqLagrange8Method = SquaredTwin(kLagrange8Method, eVR_SQLAGRANGE8);
 
 }  // namespace vetra::utils::engine
 

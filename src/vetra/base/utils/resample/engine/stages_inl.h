@@ -11,7 +11,7 @@
 //   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
-//   Floor RoundEven Abs Sqrt     RoundEven: to nearest, ties to even
+//   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
