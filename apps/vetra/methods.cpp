@@ -35,7 +35,8 @@ const Method kMethods[] = {
     {eRM_BILIN, "linear between the four pixels around"},
     {eRM_CUBIC,
      "cubic convolution with free parameter -1: sharper than most programs' -0.5 or -0.75"},
-    {eRM_CUBICPS, "as CUBIC; a masked pixel counts as the nearest one, and the frame is background"},
+    {eRM_CUBICPS,
+     "as CUBIC; a masked pixel counts as the nearest one, and the frame is background"},
     {eRM_LAGRANGE4, "Lagrange polynomials of degree 3"},
     {eRM_LAGRANGE8, "Lagrange polynomials of degree 7"},
     {eRM_SINC8, "windowed sinc over 8 pixels; 8PT is SINC8,SHAPINGWINDOW=PARABOLA", kSincKeys},
@@ -45,10 +46,11 @@ const Method kMethods[] = {
      "C x R", "0 0 C R"},
     {eRM_GAUSSIAN, "Gaussian for images reduced by the factor f; n is 2 x round(1.5 sqrt(f^2 - 1))",
      "DSFACTORCOL=f [DSFACTORROW=f]", "n x n", "1-n/2 1-n/2 n/2 n/2"},
-    {eRM_KERNEL, "the weights of a kernel file of C x R taps (vetra kernel writes them)", "FILE=PATH",
-     "C x R", "-(C-1)/2 -(R-1)/2 C/2 R/2"},
+    {eRM_KERNEL, "the weights of a kernel file of C x R taps (vetra kernel writes them)",
+     "FILE=PATH", "C x R", "-(C-1)/2 -(R-1)/2 C/2 R/2"},
     {eRM_CPLXSAR,
-     "complex radar images with carrier F, -0.5 to 0.5 cycles per row; C and R odd, at most 31. The "
+     "complex radar images with carrier F, -0.5 to 0.5 cycles per row; C and R odd, at most 31. "
+     "The "
      "carrier's phase counts from the window's first row: every result has the same turn",
      "NUMCOLS=C NUMROWS=R [FC=F]", "C x R", "-(C-1)/2 -(R-1)/2 (C+1)/2 (R+1)/2"},
 };
@@ -131,7 +133,8 @@ std::string DescribeMethods() {
     }
     return sText +
            "\nWINDOW: columns x rows of source pixels that make a target pixel.\n"
-           "MARGINS: first and last of them, as left, top, right, bottom, counted from the pixel at "
+           "MARGINS: first and last of them, as left, top, right, bottom, counted from the pixel "
+           "at "
            "or before a position.\n"
            "A method with keys: NAME,KEY=VALUE,KEY=VALUE. Keys in [ ] can be left out. All methods "
            "take MIN=v MAX=v (limits of the result) and FILL=NN|BGD (see --fill).\n";
