@@ -14,12 +14,8 @@ Case VetraCase(const Work& oWork) {
                                                   oWork.nChan, vbySrc.data(), pabyMask, false);
     auto poTgt = std::make_shared<ResampleBuffer>(
         oWork.eType, kTargetSize, kTargetSize, oWork.nChan, TargetSamples().data(), nullptr, false);
-    std::shared_ptr<IRasterResampler> poResampler;
-    if (oWork.bBilinear) {
-        poResampler = std::make_shared<BilinearResampler>();
-    } else {
-        poResampler = std::make_shared<NearestResampler>();
-    }
+    const std::shared_ptr<IRasterResampler> poResampler(
+        ResamplerFactory().GetResampler(std::string(oWork.pszMethod)));
     std::shared_ptr<IBufPosTfm> poTfm;
     if (oWork.eGeometry == Work::Geometry::eRotated) {
         poTfm = std::make_shared<BufPosArrayTfm>(kTargetSize, kTargetSize, RotatedCols().data(), 0,

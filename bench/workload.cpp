@@ -2,6 +2,7 @@
 
 #include <cmath>
 #include <cstdint>
+#include <cstdlib>
 #include <cstring>
 #include <map>
 #include <random>
@@ -9,13 +10,20 @@
 using namespace vetra::gobs;
 
 std::string Work::Name() const {
-    const char* pszGeometry = eGeometry == Geometry::eRotated ? "rotated"
-                              : eGeometry == Geometry::eDown  ? "scale down"
-                                                              : "scale up";
-    return std::string(pszGeometry) + (bBilinear ? " bilinear" : " nearest") + ", " +
-           DataTypeAdapter::TypeToString(eType) + " x " + std::to_string(nChan) +
-           (bMask ? ", mask" : "") +
+    const char* apszGeometry[] = {"rotated", "scale down", "scale up", "unit scale"};
+    const std::string sType = DataTypeAdapter::TypeToString(eType);
+    return std::string(apszGeometry[static_cast<int>(eGeometry)]) + " " + pszMethod + ", " + sType +
+           " x " + std::to_string(nChan) + (bMask ? ", mask" : "") +
            (nThreads == 0 ? std::string(", all threads") : std::string(", 1 thread"));
+}
+
+std::string Work::MethodName() const {
+    return std::string(pszMethod, std::strcspn(pszMethod, ","));
+}
+
+int Work::WindowSize() const {
+    const char* pszSize = std::strchr(pszMethod, '=');
+    return pszSize == nullptr ? 1 : std::atoi(pszSize + 1);
 }
 
 double FirstSource(Work::Geometry eGeometry) {
@@ -23,6 +31,9 @@ double FirstSource(Work::Geometry eGeometry) {
 }
 
 double ScaleOf(Work::Geometry eGeometry) {
+    if (eGeometry == Work::Geometry::eUnit) {
+        return 1.0;
+    }
     return (kSourceSize - 2 * FirstSource(eGeometry)) / kTargetSize;
 }
 
@@ -30,17 +41,18 @@ std::vector<unsigned char>& SourceSamples(const Work& oWork) {
     static std::map<std::pair<int, int>, std::vector<unsigned char>> oImages;
     auto& vbySamples = oImages[{oWork.eType, oWork.nChan}];
     if (vbySamples.empty()) {
-        const std::size_t nBytes = static_cast<std::size_t>(DataTypeAdapter::ByteSize(oWork.eType));
-        const std::size_t nSamples =
-            std::size_t{kSourceSize} * kSourceSize * static_cast<std::size_t>(oWork.nChan);
+        const bool bComplex = DataTypeAdapter::IsComplex(oWork.eType);
+        const NativeDataTypeCode eReal = DataTypeAdapter::ComplexToScalar(oWork.eType);
+        const std::size_t nBytes = static_cast<std::size_t>(DataTypeAdapter::ByteSize(eReal));
+        const std::size_t nSamples = std::size_t{kSourceSize} * kSourceSize *
+                                     static_cast<std::size_t>(oWork.nChan * (bComplex ? 2 : 1));
         vbySamples.resize(nSamples * nBytes);
         std::minstd_rand oRandom(1);
         for (std::size_t i = 0; i < nSamples; ++i) {
             const auto nValue = static_cast<std::uint16_t>(oRandom() % 200);
             const auto fValue = static_cast<float>(nValue);
             std::memcpy(&vbySamples[i * nBytes],
-                        oWork.eType == eDT_32R ? static_cast<const void*>(&fValue) : &nValue,
-                        nBytes);
+                        eReal == eDT_32R ? static_cast<const void*>(&fValue) : &nValue, nBytes);
         }
     }
     return vbySamples;
@@ -93,16 +105,30 @@ std::vector<Work> AllWorks() {
     using Geometry = Work::Geometry;
     std::vector<Work> voWorks;
     for (const Geometry eGeometry : {Geometry::eRotated, Geometry::eDown, Geometry::eUp}) {
-        for (const bool bBilinear : {false, true}) {
+        for (const char* pszMethod : {"NEAR", "BILIN"}) {
             for (const int nChan : {1, 3, 4}) {
-                voWorks.push_back({eGeometry, bBilinear, eDT_8U, nChan, false, 1});
+                voWorks.push_back({eGeometry, pszMethod, eDT_8U, nChan});
             }
             for (const NativeDataTypeCode eType : {eDT_16U, eDT_32R}) {
-                voWorks.push_back({eGeometry, bBilinear, eType, 1, false, 1});
+                voWorks.push_back({eGeometry, pszMethod, eType});
             }
-            voWorks.push_back({eGeometry, bBilinear, eDT_8U, 1, true, 1});
-            voWorks.push_back({eGeometry, bBilinear, eDT_8U, 1, false, 0});
+            voWorks.push_back({eGeometry, pszMethod, eDT_8U, 1, true});
+            voWorks.push_back({eGeometry, pszMethod, eDT_8U, 1, false, 0});
         }
+        for (const char* pszMethod : {"CUBIC", "LAGRANGE4", "LAGRANGE8", "SINC8", "SINC16",
+                                      "GAUSSIAN,DSFACTORCOL=2", "SQBILIN", "SQCUBIC", "SQSINC8"}) {
+            voWorks.push_back({eGeometry, pszMethod});
+        }
+        voWorks.push_back({eGeometry, "CUBIC", eDT_8U, 3});
+        voWorks.push_back({eGeometry, "CUBIC", eDT_8U, 1, true});
+        voWorks.push_back({eGeometry, "SINC8", eDT_8U, 1, true});
+        voWorks.push_back({eGeometry, "SINC8", eDT_8U, 1, false, 0});
     }
+    for (const char* pszMethod : {"AVERAGE,NUMCOLS=3,NUMROWS=3", "AVERAGE,NUMCOLS=31,NUMROWS=31",
+                                  "MEDIAN,NUMCOLS=3,NUMROWS=3", "MEDIAN,NUMCOLS=5,NUMROWS=5",
+                                  "MEDIAN,NUMCOLS=9,NUMROWS=9"}) {
+        voWorks.push_back({Geometry::eUnit, pszMethod});
+    }
+    voWorks.push_back({Geometry::eRotated, "CPLXSAR,NUMCOLS=7,NUMROWS=7", eDT_C32R});
     return voWorks;
 }

@@ -13,16 +13,21 @@ struct Work {
         eRotated,  ///< position arrays: turned by 0.17 rad, 0.9 source pixels per target pixel
         eDown,     ///< axis-aligned, 4096 to 3000
         eUp,       ///< axis-aligned, the inner 2048 to 3000
+        eUnit,     ///< axis-aligned, the first 3000, pixel by pixel
     };
 
     Geometry eGeometry;
-    bool bBilinear;  ///< else nearest
-    vetra::gobs::NativeDataTypeCode eType;
-    int nChan;
-    bool bMask;    ///< one source pixel in a hundred is invalid
-    int nThreads;  ///< 0: all
+    const char* pszMethod;  ///< a resampler string
+    vetra::gobs::NativeDataTypeCode eType = vetra::gobs::eDT_8U;
+    int nChan = 1;
+    bool bMask = false;  ///< one source pixel in a hundred is invalid
+    int nThreads = 1;    ///< 0: all
 
     std::string Name() const;
+    /// The method's name, without what follows a comma.
+    std::string MethodName() const;
+    /// Columns, and rows, of a mean's or median's window.
+    int WindowSize() const;
 };
 
 constexpr int kSourceSize = 4096;
