@@ -1,28 +1,29 @@
 // Cubic convolution with free parameter -1. Included inside a level's namespace; see
 // engine/stages_inl.h.
 
-// The value at fraction t from p1 towards p2.
-inline F64 CubicKernel(const F64 (&p)[4], F64 t) {
-    const F64 a = p[0] + p[0] - p[1] - p[1] + p[2] - p[3];
-    const F64 b = p[1] - p[0] - p[2] + p[3];
-    const F64 c = p[2] - p[0];
-    return ((a + b * t) * t + c) * t + p[1];
-}
+// The value between the second and the third of four samples.
+struct CubicFilter {
+    static constexpr int kTaps = 4;
+    static constexpr bool kTabulated = false;
 
-struct Cubic {
-    static constexpr int kSize = 4;
+    explicit CubicFilter(const FilterInput& oInput) : t(oInput.frac) {}
 
-    template <typename Window>
-    static F64 Value(const Window& oWindow, F64 dx, F64 dy) {
-        F64 rows[kSize];
-        for (int k = 0; k < kSize; ++k) {
-            F64 p[kSize];
-            oWindow.Row(k, p);
-            rows[k] = CubicKernel(p, dx);
-        }
-        return CubicKernel(rows, dy);
+    template <typename Samples>
+    F64 Value(const Samples& fnSample) const {
+        const F64 p0 = fnSample(0);
+        const F64 p1 = fnSample(1);
+        const F64 p2 = fnSample(2);
+        const F64 p3 = fnSample(3);
+        const F64 a = p0 + p0 - p1 - p1 + p2 - p3;
+        const F64 b = p1 - p0 - p2 + p3;
+        const F64 c = p2 - p0;
+        return ((a + b * t) * t + c) * t + p1;
     }
+
+    F64 t;
 };
+
+using Cubic = Separable<CubicFilter>;
 
 // The same with the nearest sample in the place of each masked one.
 struct CubicPs {
@@ -43,15 +44,13 @@ struct CubicPs {
         const B64 right = half <= dx;
         const F64 nearest =
             Select(half <= dy, Select(right, p[2][2], p[2][1]), Select(right, p[1][2], p[1][1]));
-        F64 rows[kSize];
-        for (int k = 0; k < kSize; ++k) {
+        const CubicFilter oAcross(oWindow.template ColumnInput<CubicFilter>(dx));
+        const CubicFilter oDown(oWindow.template RowInput<CubicFilter>(dy));
+        return oDown.Value([&](int k) {
             F64 mask[kSize];
             oWindow.MaskRow(k, mask);
-            for (int j = 0; j < kSize; ++j) {
-                p[k][j] = Select(mask[j] == Set1(0.0), nearest, p[k][j]);
-            }
-            rows[k] = CubicKernel(p[k], dx);
-        }
-        return CubicKernel(rows, dy);
+            return oAcross.Value(
+                [&](int j) { return Select(mask[j] == Set1(0.0), nearest, p[k][j]); });
+        });
     }
 };

@@ -22,6 +22,7 @@
 
 #include "vetra/base/utils/resample/engine/columntables.h"
 #include "vetra/base/utils/resample/engine/positions.h"
+#include "vetra/base/utils/resample/engine/rowcache.h"
 #include "vetra/base/utils/resample/engine/task.h"
 
 namespace vetra::utils::engine {
@@ -48,7 +49,9 @@ struct Span {
     const double* padfFracCol = nullptr;
     const double* padfFracRow = nullptr;
     const unsigned char* pabyWindowMask = nullptr;
-    const PairGroup* poGroups = nullptr;
+    // Has the values of the windows where it isn't null; else they are made of source samples.
+    RowCache* poRows = nullptr;
+    int nFirstCol = 0;
 
     const unsigned char* ModesUnless(unsigned nSet) const {
         return nModes == nSet ? nullptr : pabyMode;
@@ -91,23 +94,29 @@ class Run {
  public:
     explicit Run(const Task& oTask);
 
-    // Doubles of working memory that a thread needs; none where no window fits into the source.
-    std::size_t GetScratchSize() const;
+    // What a thread needs beside the stack. Throws std::bad_alloc.
+    struct ThreadMemory {
+        std::unique_ptr<double[]> padfScratch;
+        std::unique_ptr<RowCache> poRows;
+    };
+    ThreadMemory MakeThreadMemory() const;
 
     // Fills target pixels nBegin to nEnd - 1.
-    void Walk(long long nBegin, long long nEnd, double* padfScratch) const {
-        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd, padfScratch)
-                                  : WalkRows(nBegin, nEnd, padfScratch);
+    void Walk(long long nBegin, long long nEnd, const ThreadMemory& oMemory) const {
+        ValueArrays oValues;
+        oValues.padfScratch = oMemory.padfScratch.get();
+        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd, oValues)
+                                  : WalkRows(nBegin, nEnd, oMemory.poRows.get(), oValues);
     }
 
  private:
-    void WalkGeneral(long long nBegin, long long nEnd, double* padfScratch) const;
+    void WalkGeneral(long long nBegin, long long nEnd, ValueArrays& oValues) const;
     void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
     // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
     [[gnu::always_inline]] inline void Prefetch(const Span& oSpan) const;
 
-    void WalkRows(long long nBegin, long long nEnd, double* padfScratch) const;
-    void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+    void WalkRows(long long nBegin, long long nEnd, RowCache* poRows, ValueArrays& oValues) const;
+    void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, RowCache* poRows,
                  ValueArrays& oValues) const;
 
     void ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
@@ -145,6 +154,7 @@ class Run {
     // Samples go from source to target as they are; null where they pass through a double.
     CopyFunction mpfnCopy = nullptr;
     ColumnTables moColumns;
+    RowPlan moRowPlan;
 };
 
 Run::Run(const Task& oTask)
@@ -179,25 +189,27 @@ Run::Run(const Task& oTask)
         }
         if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
             moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits, moModes);
+            moRowPlan = RowPlan(oTask, moStages, moColumns);
         }
     }
 }
 
-std::size_t Run::GetScratchSize() const {
+Run::ThreadMemory Run::MakeThreadMemory() const {
+    ThreadMemory oMemory;
     const Window& oWindow = moMethod.oWindow;
-    if (moMethod.nScratch == 0 || oWindow.nCols > moTask.nSrcCols ||
-        oWindow.nRows > moTask.nSrcRows) {
-        return 0;
+    // Where no window fits none is computed, and its size is only a number.
+    if (oWindow.nCols <= moTask.nSrcCols && oWindow.nRows <= moTask.nSrcRows) {
+        if (!moRowPlan.IsEmpty()) {
+            oMemory.poRows = std::make_unique<RowCache>(moTask, moRowPlan);
+        } else if (moMethod.eScratch != Scratch::eNone) {
+            oMemory.padfScratch.reset(new double[GetScratchSize(moMethod)]);
+        }
     }
-    // No more than the pixels of the source, which are in memory.
-    return static_cast<std::size_t>(oWindow.nCols) * static_cast<std::size_t>(oWindow.nRows) *
-           static_cast<std::size_t>(kLanes * moMethod.nScratch);
+    return oMemory;
 }
 
-void Run::WalkGeneral(long long nBegin, long long nEnd, double* padfScratch) const {
+void Run::WalkGeneral(long long nBegin, long long nEnd, ValueArrays& oValues) const {
     SpanArrays oArrays;
-    ValueArrays oValues;
-    oValues.padfScratch = padfScratch;
     for (long long nFirst = nBegin; nFirst < nEnd; nFirst += kSpanPixels) {
         Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)), oArrays);
         Finish(oArrays.oSpan, oValues);
@@ -292,24 +304,32 @@ void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
     }
 }
 
-void Run::WalkRows(long long nBegin, long long nEnd, double* padfScratch) const {
-    ValueArrays oValues;
-    oValues.padfScratch = padfScratch;
+void Run::WalkRows(long long nBegin, long long nEnd, RowCache* poRows, ValueArrays& oValues) const {
     const int nCols = moTask.nTgtCols;
-    for (long long nFirst = nBegin; nFirst < nEnd;) {
-        const int nFirstCol = static_cast<int>(nFirst % nCols);
-        const int nNumCols =
-            static_cast<int>(std::min<long long>(nCols - nFirstCol, nEnd - nFirst));
-        double dfCol = 0.0;
-        double dfRow = 0.0;
-        moTask.poTfm->GetSrcPos(nFirst, dfCol, dfRow);
-        FillRow(dfRow, nFirst, nFirstCol, nNumCols, oValues);
-        nFirst += nNumCols;
+    const std::vector<Strip> voWhole = {{0, nCols, 0, 0}};
+    for (const Strip& oStrip : poRows != nullptr ? moRowPlan.GetStrips() : voWhole) {
+        if (poRows != nullptr) {
+            poRows->SetStrip(oStrip);
+        }
+        for (long long nRow = nBegin / nCols; nRow * nCols < nEnd; ++nRow) {
+            // The row's share, as far as it lies in the strip.
+            const long long nFirst = std::max(nBegin, nRow * nCols + oStrip.nFirstCol);
+            const long long nLast =
+                std::min(nEnd, nRow * nCols + oStrip.nFirstCol + oStrip.nNumCols);
+            if (nFirst >= nLast) {
+                continue;
+            }
+            double dfCol = 0.0;
+            double dfRow = 0.0;
+            moTask.poTfm->GetSrcPos(nFirst, dfCol, dfRow);
+            FillRow(dfRow, nFirst, static_cast<int>(nFirst % nCols),
+                    static_cast<int>(nLast - nFirst), poRows, oValues);
+        }
     }
 }
 
 // Fills a stretch of one target row.
-void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, RowCache* poRows,
                   ValueArrays& oValues) const {
     const double dfNearRow = std::floor(dfRow + 0.5);
     const double dfAnchorRow = moLimits.bAnchorNearest ? dfNearRow : std::floor(dfRow);
@@ -333,6 +353,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
     if (moTask.pabySrcMask != nullptr) {
         oSpan.pabyWindowMask = moTask.pabySrcMask + nWindowRow * moTask.nSrcCols;
     }
+    bool bFetched = false;
     alignas(64) unsigned char abyMode[kSpanArray];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
         const std::size_t nCol = static_cast<std::size_t>(nFirstCol + nDone);
@@ -341,9 +362,6 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         oSpan.padfFracCol = moColumns.vdfFrac.data() + nCol;
         oSpan.panWindow = moColumns.vnWindow.data() + nCol;
         oSpan.panNearest = moColumns.vnNearest.data() + nCol;
-        oSpan.poGroups = moColumns.voGroups.empty() || nCol % kLanes != 0
-                             ? nullptr
-                             : moColumns.voGroups.data() + nCol / kLanes;
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
         } else {
@@ -357,6 +375,14 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             oSpan.pabyMode = abyMode;
         }
         oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
+        if (poRows != nullptr && (oSpan.nModes & kSetInterpolated) != 0) {
+            if (!bFetched) {
+                poRows->SetWindowRow(nWindowRow, dfFracRow);
+                bFetched = true;
+            }
+            oSpan.poRows = poRows;
+            oSpan.nFirstCol = nFirstCol + nDone;
+        }
         Finish(oSpan, oValues);
     }
 }
@@ -388,17 +414,18 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.nPitch = mnPitch;
     oWindows.nChan = moTask.nChan;
     oWindows.pabyMask = oSpan.pabyWindowMask;
-    oWindows.poGroups = oSpan.poGroups;
     oWindows.pParameters = moTask.pParameters;
     oWindows.padfScratch = oValues.padfScratch;
     for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
-        if (bWindows) {
+        double* padfValue = oValues.adfValue;
+        if (bWindows && oSpan.poRows != nullptr) {
+            padfValue = oSpan.poRows->GetValues(nChannel, oSpan.nFirstCol, oSpan.nPix);
+        } else if (bWindows) {
             moStages.apfnValues[moMethod.eValues][moTask.nSrcType](
-                oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes,
-                oValues.adfValue);
+                oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes, padfValue);
         }
         for (int i = 0; i < moMethod.nChannels; ++i) {
-            StoreChannel(oSpan, nChannel + i, oValues.adfValue + i * kSpanArray, oValues.abySample);
+            StoreChannel(oSpan, nChannel + i, padfValue + i * kSpanArray, oValues.abySample);
         }
     }
 }
@@ -507,12 +534,9 @@ void Execute(const Task& oTask) {
     const Run oRun(oTask);
     const long long nNumPix = static_cast<long long>(oTask.nTgtCols) * oTask.nTgtRows;
     const int nMaxThreads = omp_get_max_threads();
-    const std::size_t nScratch = oRun.GetScratchSize();
-    std::vector<std::unique_ptr<double[]>> vpadfScratch(static_cast<std::size_t>(nMaxThreads));
-    if (nScratch > 0) {
-        for (auto& padfScratch : vpadfScratch) {
-            padfScratch.reset(new double[nScratch]);
-        }
+    std::vector<Run::ThreadMemory> voMemory;
+    for (int i = 0; i < nMaxThreads; ++i) {
+        voMemory.push_back(oRun.MakeThreadMemory());
     }
 #pragma omp parallel num_threads(nMaxThreads)
     {
@@ -523,7 +547,7 @@ void Execute(const Task& oTask) {
         const long long nBegin = nThread * nShare + std::min<long long>(nThread, nRest);
         const long long nEnd = nBegin + nShare + (nThread < nRest ? 1 : 0);
         if (nBegin < nEnd) {
-            oRun.Walk(nBegin, nEnd, vpadfScratch[static_cast<std::size_t>(nThread)].get());
+            oRun.Walk(nBegin, nEnd, voMemory[static_cast<std::size_t>(nThread)]);
         }
     }
 }

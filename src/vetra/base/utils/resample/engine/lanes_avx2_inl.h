@@ -110,3 +110,5 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
 }
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
+
+inline F64 GatherNear(const double* p, const std::int64_t* o) { return Gather(p, o); }

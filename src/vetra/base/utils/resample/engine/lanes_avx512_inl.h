@@ -66,4 +66,9 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
     _mm512_storeu_si512(p, _mm512_cvttpd_epi64(a.v));
 }
 
+inline F64 GatherNear(const double* p, const std::int64_t* o) {
+    return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), _mm512_loadu_si512(o),
+                                   _mm512_loadu_pd(p + kLanes))};
+}
+
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"

@@ -99,6 +99,14 @@ inline void SplitPairs16(__m256i vPairs, __m256i& v0, __m256i& v1) {
     }
 }
 
+// The first and the second 32 bits of eight times 64, of which v0 holds the lanes 0 to 3.
+inline void SplitWords(__m256i v0, __m256i v1, __m256i& vFirst, __m256i& vSecond) {
+    const __m256 vLow = _mm256_castsi256_ps(_mm256_permute2x128_si256(v0, v1, 0x20));   // 0 1 | 4 5
+    const __m256 vHigh = _mm256_castsi256_ps(_mm256_permute2x128_si256(v0, v1, 0x31));  // 2 3 | 6 7
+    vFirst = _mm256_castps_si256(_mm256_shuffle_ps(vLow, vHigh, 0x88));
+    vSecond = _mm256_castps_si256(_mm256_shuffle_ps(vLow, vHigh, 0xdd));
+}
+
 // The types whose samples the functions below read; the 64-bit integers and 32U go the plain way.
 enum class Kind { eSmall8, eSmall16, eInt32, eFloat, eDouble, eOther };
 template <typename T>
@@ -156,19 +164,15 @@ inline void GatherPair(const T* p, const std::int64_t* o, F64& a, F64& b) {
         a = FromInt32(v0);
         b = FromInt32(v1);
     } else if constexpr (kKind<T> == Kind::eInt32 || kKind<T> == Kind::eFloat) {
-        // Lanes of v0: pairs 0 1 | 2 3, of v1: 4 5 | 6 7.
-        const __m256 v0 = _mm256_castsi256_ps(Gather64<4>(p, o, 0));
-        const __m256 v1 = _mm256_castsi256_ps(Gather64<4>(p, o, 4));
-        const __m256 vLow = _mm256_permute2f128_ps(v0, v1, 0x20);   // 0 1 | 4 5
-        const __m256 vHigh = _mm256_permute2f128_ps(v0, v1, 0x31);  // 2 3 | 6 7
-        const __m256 vFirst = _mm256_shuffle_ps(vLow, vHigh, 0x88);
-        const __m256 vSecond = _mm256_shuffle_ps(vLow, vHigh, 0xdd);
+        __m256i vFirst;
+        __m256i vSecond;
+        SplitWords(Gather64<4>(p, o, 0), Gather64<4>(p, o, 4), vFirst, vSecond);
         if constexpr (kKind<T> == Kind::eInt32) {
-            a = FromInt32(_mm256_castps_si256(vFirst));
-            b = FromInt32(_mm256_castps_si256(vSecond));
+            a = FromInt32(vFirst);
+            b = FromInt32(vSecond);
         } else {
-            a = FromFloat(vFirst);
-            b = FromFloat(vSecond);
+            a = FromFloat(_mm256_castsi256_ps(vFirst));
+            b = FromFloat(_mm256_castsi256_ps(vSecond));
         }
     } else {
         a = Gather(p, o);
@@ -176,13 +180,119 @@ inline void GatherPair(const T* p, const std::int64_t* o, F64& a, F64& b) {
     }
 }
 
+// Eight times 128 bits, those of the lanes i and i + 4 in each register.
+template <int nScale>
+inline void Gather128(const void* p, const std::int64_t* o, __m256 (&r)[4]) {
+    const char* q = static_cast<const char*>(p);
+    const auto fnLoad = [&](int i) {
+        return _mm_loadu_ps(reinterpret_cast<const float*>(q + nScale * o[i]));
+    };
+    for (int i = 0; i < 4; ++i) {
+        r[i] = _mm256_set_m128(fnLoad(i + 4), fnLoad(i));
+    }
+}
+
+// The 32-bit values of such registers, position by position.
+inline void Transpose(__m256 (&r)[4]) {
+    const __m256d t0 = _mm256_castps_pd(_mm256_unpacklo_ps(r[0], r[1]));
+    const __m256d t1 = _mm256_castps_pd(_mm256_unpackhi_ps(r[0], r[1]));
+    const __m256d t2 = _mm256_castps_pd(_mm256_unpacklo_ps(r[2], r[3]));
+    const __m256d t3 = _mm256_castps_pd(_mm256_unpackhi_ps(r[2], r[3]));
+    r[0] = _mm256_castpd_ps(_mm256_unpacklo_pd(t0, t2));
+    r[1] = _mm256_castpd_ps(_mm256_unpackhi_pd(t0, t2));
+    r[2] = _mm256_castpd_ps(_mm256_unpacklo_pd(t1, t3));
+    r[3] = _mm256_castpd_ps(_mm256_unpackhi_pd(t1, t3));
+}
+
+// Four doubles each of the lanes i to i + 3, position by position.
+inline void GatherFour64(const double* p, const std::int64_t* o, __m256d (&r)[4]) {
+    const __m256d a = _mm256_loadu_pd(p + o[0]);
+    const __m256d b = _mm256_loadu_pd(p + o[1]);
+    const __m256d c = _mm256_loadu_pd(p + o[2]);
+    const __m256d d = _mm256_loadu_pd(p + o[3]);
+    const __m256d t0 = _mm256_unpacklo_pd(a, b);
+    const __m256d t1 = _mm256_unpackhi_pd(a, b);
+    const __m256d t2 = _mm256_unpacklo_pd(c, d);
+    const __m256d t3 = _mm256_unpackhi_pd(c, d);
+    r[0] = _mm256_permute2f128_pd(t0, t2, 0x20);
+    r[1] = _mm256_permute2f128_pd(t1, t3, 0x20);
+    r[2] = _mm256_permute2f128_pd(t0, t2, 0x31);
+    r[3] = _mm256_permute2f128_pd(t1, t3, 0x31);
+}
+
+// Four adjacent samples at each offset.
 template <typename T>
-inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {
-    const __m128i v =
-        _mm_shuffle_epi8(_mm_loadu_si128(reinterpret_cast<const __m128i*>(p)),
-                         _mm_loadu_si128(reinterpret_cast<const __m128i*>(pabyPlace)));
-    a = FromInt32(Widen<T>(v));
-    b = FromInt32(Widen<T>(_mm_srli_si128(v, 8)));
+inline void GatherQuad(const T* p, const std::int64_t* o, F64 (&q)[4]) {
+    if constexpr (kKind<T> == Kind::eSmall8) {
+        const __m256i v = Gather32<1>(p, o);
+        if constexpr (kIsSigned<T>) {
+            q[0] = FromInt32(_mm256_srai_epi32(_mm256_slli_epi32(v, 24), 24));
+            q[1] = FromInt32(_mm256_srai_epi32(_mm256_slli_epi32(v, 16), 24));
+            q[2] = FromInt32(_mm256_srai_epi32(_mm256_slli_epi32(v, 8), 24));
+            q[3] = FromInt32(_mm256_srai_epi32(v, 24));
+        } else {
+            const __m256i vLow = _mm256_set1_epi32(0xff);
+            q[0] = FromInt32(_mm256_and_si256(v, vLow));
+            q[1] = FromInt32(_mm256_and_si256(_mm256_srli_epi32(v, 8), vLow));
+            q[2] = FromInt32(_mm256_and_si256(_mm256_srli_epi32(v, 16), vLow));
+            q[3] = FromInt32(_mm256_srli_epi32(v, 24));
+        }
+    } else if constexpr (kKind<T> == Kind::eSmall16) {
+        __m256i vFirst;
+        __m256i vSecond;
+        SplitWords(Gather64<2>(p, o, 0), Gather64<2>(p, o, 4), vFirst, vSecond);
+        __m256i v[4];
+        SplitPairs16<T>(vFirst, v[0], v[1]);
+        SplitPairs16<T>(vSecond, v[2], v[3]);
+        for (int j = 0; j < 4; ++j) {
+            q[j] = FromInt32(v[j]);
+        }
+    } else if constexpr (kKind<T> == Kind::eInt32 || kKind<T> == Kind::eFloat) {
+        __m256 r[4];
+        Gather128<4>(p, o, r);
+        Transpose(r);
+        for (int j = 0; j < 4; ++j) {
+            if constexpr (kKind<T> == Kind::eInt32) {
+                q[j] = FromInt32(_mm256_castps_si256(r[j]));
+            } else {
+                q[j] = FromFloat(r[j]);
+            }
+        }
+    } else if constexpr (kKind<T> == Kind::eDouble) {
+        __m256d lo[4];
+        __m256d hi[4];
+        GatherFour64(p, o, lo);
+        GatherFour64(p, o + 4, hi);
+        for (int j = 0; j < 4; ++j) {
+            q[j] = FromHalves(lo[j], hi[j]);
+        }
+    } else {
+        for (int j = 0; j < 4; ++j) {
+            q[j] = Gather(p + j, o);
+        }
+    }
+}
+
+template <typename T>
+inline F64 LoadSamples(const T* p) {
+    const auto* v = reinterpret_cast<const __m128i*>(p);
+    if constexpr (kKind<T> == Kind::eSmall8) {
+        return FromInt32(Widen<T>(_mm_loadl_epi64(v)));
+    } else if constexpr (kKind<T> == Kind::eSmall16) {
+        return FromInt32(Widen<T>(_mm_loadu_si128(v)));
+    } else if constexpr (kKind<T> == Kind::eInt32) {
+        return FromInt32(_mm256_loadu_si256(reinterpret_cast<const __m256i*>(p)));
+    } else if constexpr (kKind<T> == Kind::eFloat) {
+        return LoadFloats(p);
+    } else if constexpr (kKind<T> == Kind::eDouble) {
+        return Load(p);
+    } else {
+        double adf[kLanes];
+        for (int i = 0; i < kLanes; ++i) {
+            adf[i] = static_cast<double>(p[i]);
+        }
+        return Load(adf);
+    }
 }
 
 // Copies the eight samples at the offsets.

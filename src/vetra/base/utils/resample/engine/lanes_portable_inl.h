@@ -142,12 +142,21 @@ inline void GatherPair(const T* p, const std::int64_t* panOffset, F64& a, F64& b
 }
 
 template <typename T>
-inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {
-    for (int i = 0; i < kParts; ++i) {
-        const unsigned char* q = pabyPlace + 2 * i;
-        a.v[i] = Pair{static_cast<double>(p[q[0]]), static_cast<double>(p[q[1]])};
-        b.v[i] = Pair{static_cast<double>(p[q[kLanes]]), static_cast<double>(p[q[kLanes + 1]])};
+inline void GatherQuad(const T* p, const std::int64_t* panOffset, F64 (&q)[4]) {
+    for (int j = 0; j < 4; ++j) {
+        q[j] = Gather(p + j, panOffset);
     }
+}
+inline F64 GatherNear(const double* p, const std::int64_t* panOffset) {
+    return Gather(p, panOffset);
+}
+template <typename T>
+inline F64 LoadSamples(const T* p) {
+    F64 a;
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = Pair{static_cast<double>(p[2 * i]), static_cast<double>(p[2 * i + 1])};
+    }
+    return a;
 }
 
 template <typename T>

@@ -19,16 +19,20 @@ inline constexpr Method kBilinearMethod{ModeRule::eWindow, SquareWindow(2), eVR_
 inline constexpr Method kCubicMethod{ModeRule::eWindow, SquareWindow(4), eVR_CUBIC, false};
 inline constexpr Method kCubicPsMethod{ModeRule::eReplacingWindow, SquareWindow(4), eVR_CUBICPS,
                                        false};
-inline constexpr Method kSinc8Method{ModeRule::eWindow, SquareWindow(8), eVR_SINC8, false};
-inline constexpr Method kSinc16Method{ModeRule::eWindow, SquareWindow(16), eVR_SINC16, false};
+inline constexpr Method kSinc8Method{ModeRule::eWindow, SquareWindow(8), eVR_SINC8, false, 1,
+                                     Scratch::eTaps};
+inline constexpr Method kSinc16Method{ModeRule::eWindow, SquareWindow(16), eVR_SINC16, false, 1,
+                                      Scratch::eTaps};
 inline constexpr Method kLagrange4Method{ModeRule::eWindow, SquareWindow(4), eVR_LAGRANGE4, false};
 inline constexpr Method kLagrange8Method{ModeRule::eWindow, SquareWindow(8), eVR_LAGRANGE8, false};
 
 /// Methods whose windows have a size of their own in each run; see `WithWindow`.
 inline constexpr Method kAverageMethod{ModeRule::eWindow, {}, eVR_AVERAGE, false};
-inline constexpr Method kMedianMethod{ModeRule::eWindow, {}, eVR_MEDIAN, false, 1, 1};
-inline constexpr Method kKernelMethod{ModeRule::eWindow, {}, eVR_KERNEL, false};
-inline constexpr Method kCplxSarMethod{ModeRule::eWindow, {}, eVR_CPLXSAR, false, 2};
+inline constexpr Method kMedianMethod{ModeRule::eWindow, {}, eVR_MEDIAN, false, 1,
+                                      Scratch::eSamples};
+inline constexpr Method kKernelMethod{ModeRule::eWindow, {}, eVR_KERNEL, false, 1, Scratch::eTaps};
+inline constexpr Method kCplxSarMethod{ModeRule::eWindow, {}, eVR_CPLXSAR, false, 2,
+                                       Scratch::eTaps};
 
 /// The method with the window of a run.
 constexpr Method WithWindow(Method oMethod, const Window& oWindow) {
@@ -54,7 +58,8 @@ inline constexpr Method kSqSinc16Method = SquaredTwin(kSinc16Method, eVR_SQSINC1
 inline constexpr Method kSqAverageMethod = SquaredTwin(kAverageMethod, eVR_SQAVERAGE);
 inline constexpr Method kSqMedianMethod = SquaredTwin(kMedianMethod, eVR_SQMEDIAN);
 /// Unlike the others it leaves negative nearest samples as they are.
-inline constexpr Method kSqKernelMethod{ModeRule::eWindow, {}, eVR_SQKERNEL, false};
+inline constexpr Method kSqKernelMethod{ModeRule::eWindow, {}, eVR_SQKERNEL, false, 1,
+                                        Scratch::eTaps};
 
 }  // namespace vetra::utils::engine
 

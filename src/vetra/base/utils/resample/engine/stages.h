@@ -56,13 +56,28 @@ struct BilinearCorners {
     int nRows;
 };
 
-/// How to pick the pairs of samples of eight pixels out of sixteen adjacent 8-bit samples.
-struct PairGroup {
-    static constexpr int kBytes = 16;
-    /// Of the sixteen samples, from the start of the row; below 0 where they don't hold all pairs.
-    std::int64_t nOffset;
-    /// Places of the first samples, then of the second ones.
-    unsigned char abyPlace[kBytes];
+/// How eight neighbouring target columns take samples from a row of doubles.
+struct PickGroup {
+    /// Of each column's window, the place of the first sample, counted from nFirst.
+    alignas(64) std::int64_t anOffset[kLanes];
+    std::int64_t nFirst;
+    bool bNear;  ///< all places are below kNearReach
+};
+constexpr int kNearReach = 16;
+
+/// Windows of a stretch of one target row, over rows of doubles. A row has kNearReach doubles more
+/// than the windows need.
+struct RowWindows {
+    const double* const* papdfRow;  ///< of the windows, in order
+    int nFirst;                     ///< place of the first pixel in rows that are filtered already
+    const PickGroup* poGroups;      ///< one for each kLanes pixels
+    const double* padfFracCol;
+    double dfFracRow;
+    /// For filters with tabulated weights: taps x kLanes weights for each group.
+    const double* padfColumnTaps;
+    const void* pParameters;
+    double* padfScratch;
+    int nPix;
 };
 
 /// The windows of a span, in mode 1, as the methods see them. Pixels of other modes have offset 0:
@@ -82,9 +97,6 @@ struct WindowSpan {
     std::int64_t nPitch;
     /// Samples from a pixel to the next.
     int nChan;
-    /// Of each eight pixels, for 8-bit samples and windows of two columns in an axis-aligned run of
-    /// one channel; else null.
-    const PairGroup* poGroups;
     /// What the method prepared for the run; may be null.
     const void* pParameters;
     /// The thread's own working memory, as much as the method asked for; null if it didn't.
@@ -132,6 +144,13 @@ struct StoreLimits {
 /// takes two channels at once, two arrays kSpanArray apart. pSrc points at the (first) channel's
 /// first sample.
 using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, double* padfValue);
+/// Makes doubles of nCount samples, nChan apart.
+using WidenFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padf);
+/// Filters a row along the columns, for all pixels of oRows.
+using AcrossFunction = void (*)(const RowWindows& oRows, const double* padfRow,
+                                double* padfFiltered);
+/// Computes the values of all pixels of oRows.
+using RowValuesFunction = void (*)(const RowWindows& oRows, double* padfValue);
 /// Reads the samples at panOffset of the pixels whose mode is 2.
 using NearestFunction = void (*)(const void* pSrc, const std::int64_t* panOffset,
                                  const unsigned char* pabyMode, int nPix, double* padfValue);
@@ -146,11 +165,19 @@ using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void
 
 /// The ways of making a value out of a window: name of the row in a level's table, and the type
 /// that holds the mathematics. Each row has a twin that works on the roots of the samples.
-#define VETRA_VALUES_ROWS(Row)                                                            \
-    Row(BILINEAR, Bilinear) Row(CUBIC, Cubic) Row(CUBICPS, CubicPs)                       \
-        Row(LAGRANGE4, Lagrange<LagrangeBasis4>) Row(LAGRANGE8, Lagrange<LagrangeBasis8>) \
-            Row(SINC8, Kernel<8>) Row(SINC16, Kernel<16>) Row(KERNEL, Kernel<kAnySize>)   \
-                Row(AVERAGE, Average) Row(MEDIAN, Median)
+// clang-format off
+#define VETRA_VALUES_ROWS(Row)                \
+    Row(BILINEAR, Bilinear)                   \
+    Row(CUBIC, Cubic)                         \
+    Row(CUBICPS, CubicPs)                     \
+    Row(LAGRANGE4, Separable<Lagrange4Filter>) \
+    Row(LAGRANGE8, Separable<Lagrange8Filter>) \
+    Row(SINC8, Separable<KernelFilter<8>>)    \
+    Row(SINC16, Separable<KernelFilter<16>>)  \
+    Row(KERNEL, Separable<KernelFilter<kAnySize>>) \
+    Row(AVERAGE, Average)                     \
+    Row(MEDIAN, Median)
+// clang-format on
 
 enum ValuesRow : int {
 #define VETRA_ROW(Name, Type) eVR_##Name, eVR_SQ##Name,
@@ -159,6 +186,15 @@ enum ValuesRow : int {
         eVR_CPLXSAR,
     kNumValues,
     eVR_NONE = -1,  ///< for a method without a window
+};
+
+/// How a row of the values table is computed from rows of doubles; empty where it can't be.
+struct RowStages {
+    /// Null for a method that isn't separable: its values come from whole rows.
+    AcrossFunction pfnAcross;
+    RowValuesFunction pfnValues;
+    RowValuesFunction pfnSquaredValues;
+    bool bTabulated;  ///< the columns' taps are those of ColumnTaps
 };
 
 /// The stages of one processor level.
@@ -203,6 +239,14 @@ struct LevelStages {
 
     // Values and stores, by sample type.
     ValuesFunction apfnValues[kNumValues][kNumSampleTypes];
+    WidenFunction apfnWiden[kNumSampleTypes];
+    /// Makes the roots of the samples.
+    WidenFunction apfnWidenRoots[kNumSampleTypes];
+    /// The taps of a row's groups, by which rows are filtered.
+    void (*pfnColumnTaps)(const void* pParameters, const double* padfFracCol, int nPix,
+                          double* padfTaps);
+    /// By the half of a row's number, which it shares with its squared twin.
+    RowStages aoRows[(kNumValues - 1) / 2];
     NearestFunction apfnNearest[kNumSampleTypes];
     /// With 0 in the place of negative samples.
     NearestFunction apfnNonNegativeNearest[kNumSampleTypes];

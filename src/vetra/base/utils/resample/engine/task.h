@@ -1,11 +1,20 @@
 #ifndef VETRA_BASE_UTILS_RESAMPLE_ENGINE_TASK_H
 #define VETRA_BASE_UTILS_RESAMPLE_ENGINE_TASK_H
 
+#include <cstddef>
+
 #include "vetra/base/utils/resample/engine/levels.h"
 #include "vetra/base/utils/resample/engine/pixelmode.h"
 #include "vetra/base/utils/resample/postfm/ibufpostfm.h"
 
 namespace vetra::utils::engine {
+
+/// Working memory that the values stage needs, for kLanes pixels at once.
+enum class Scratch {
+    eNone,
+    eTaps,     ///< the weights of a window's columns, and two for each row
+    eSamples,  ///< the samples of a window
+};
 
 /// A sampling method, as the loop sees it: its window, how it decides what becomes of a pixel, and
 /// where its values stage stands in a level's table.
@@ -17,9 +26,23 @@ struct Method {
     bool bNonNegative;
     /// Channels whose values come out of one call of the values stage.
     int nChannels = 1;
-    /// Doubles of working memory for each pixel of a window, for each of kLanes pixels at once.
-    int nScratch = 0;
+    Scratch eScratch = Scratch::eNone;
 };
+
+/// Doubles of working memory that a thread needs.
+inline std::size_t GetScratchSize(const Method& oMethod) {
+    const std::size_t nCols = static_cast<std::size_t>(oMethod.oWindow.nCols);
+    const std::size_t nRows = static_cast<std::size_t>(oMethod.oWindow.nRows);
+    switch (oMethod.eScratch) {
+        case Scratch::eTaps:
+            return (nCols + 2 * nRows) * kLanes;
+        case Scratch::eSamples:
+            return nCols * nRows * kLanes;
+        case Scratch::eNone:
+            break;
+    }
+    return 0;
+}
 
 /// What a run can be asked for beyond its result. The defaults are what every caller gets; tests
 /// ask for the rest.

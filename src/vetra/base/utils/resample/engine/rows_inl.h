@@ -1,0 +1,108 @@
+// The values stage of axis-aligned runs: source rows become doubles once, and separable methods
+// filter each of them along the columns once, for all the target rows that need it. Included inside
+// a level's namespace; see stages_inl.h.
+
+// A stretch of one channel of a source row as doubles, or as their roots.
+template <typename T, bool kRoots>
+void Widen(const void* pSrc, int nChan, std::int64_t nCount, double* padf) {
+    const T* p = static_cast<const T*>(pSrc);
+    std::int64_t anOffset[kLanes];
+    for (int i = 0; i < kLanes; ++i) {
+        anOffset[i] = static_cast<std::int64_t>(i) * nChan;
+    }
+    const auto fnRoot = [](F64 v) { return kRoots ? Root(v) : v; };
+    std::int64_t n = 0;
+    for (; n + kLanes <= nCount; n += kLanes, p += static_cast<std::int64_t>(nChan) * kLanes) {
+        Store(padf + n, fnRoot(nChan == 1 ? LoadSamples(p) : Gather(p, anOffset)));
+    }
+    for (; n < nCount; ++n, p += nChan) {
+        double adf[kLanes];
+        Store(adf, fnRoot(Set1(static_cast<double>(*p))));
+        padf[n] = adf[0];
+    }
+}
+
+// Calls fnGroup with the first pixel of each group and a reader of its windows.
+template <typename Function>
+inline void ForEachRowGroup(const RowWindows& oRows, const Function& fnGroup) {
+    for (int i = 0; i < oRows.nPix; i += kLanes) {
+        const PickGroup& oGroup = oRows.poGroups[i / kLanes];
+        if (oGroup.bNear) {
+            fnGroup(i, RowReader<true>{oRows, oGroup});
+        } else {
+            fnGroup(i, RowReader<false>{oRows, oGroup});
+        }
+    }
+}
+
+// Taps of each group's columns, nCols x kLanes of them.
+void ColumnTaps(const void* pParameters, const double* padfFracCol, int nPix, double* padfTaps) {
+    const KernelTables& oTables = *static_cast<const KernelTables*>(pParameters);
+    for (int i = 0; i < nPix; i += kLanes) {
+        GatherAcrossTaps(oTables, Load(padfFracCol + i), padfTaps);
+        padfTaps += oTables.nCols * kLanes;
+    }
+}
+
+// One row, filtered along the columns.
+template <typename Filter>
+void Across(const RowWindows& oRows, const double* padfRow, double* padfFiltered) {
+    int nTaps = Filter::kTaps;
+    if constexpr (Filter::kTabulated) {
+        nTaps = static_cast<const KernelTables*>(oRows.pParameters)->nCols;
+    }
+    ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
+        const Filter oAcross(FilterInput{Load(oRows.padfFracCol + i),
+                                         oRows.padfColumnTaps + std::int64_t{i} * nTaps, nTaps});
+        Store(padfFiltered + i, oAcross.Value([&](int j) { return oWindow.Pick(padfRow, j); }));
+    });
+}
+
+template <bool kSquared>
+inline void StoreRowValue(double* p, F64 value) {
+    StoreValue(p, kSquared ? value * value : value);
+}
+
+// Values from filtered rows.
+template <typename Filter, bool kSquared>
+void Down(const RowWindows& oRows, double* padfValue) {
+    const F64 dy = Set1(oRows.dfFracRow);
+    FilterInput oInput{dy, oRows.padfScratch, Filter::kTaps};
+    if constexpr (Filter::kTabulated) {
+        const KernelTables& oTables = *static_cast<const KernelTables*>(oRows.pParameters);
+        GatherDownTaps(oTables, dy, oRows.padfScratch);
+        oInput.nTaps = oTables.nRows;
+    }
+    const Filter oDown(oInput);
+    for (int i = 0; i < oRows.nPix; i += kLanes) {
+        StoreRowValue<kSquared>(padfValue + i, oDown.Value([&](int k) {
+            return Load(oRows.papdfRow[k] + oRows.nFirst + i);
+        }));
+    }
+}
+
+// Values of a method that isn't separable, from whole rows.
+template <typename Method, bool kSquared>
+void RowValues(const RowWindows& oRows, double* padfValue) {
+    const F64 dy = Set1(oRows.dfFracRow);
+    ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
+        StoreRowValue<kSquared>(padfValue + i,
+                                Method::Value(oWindow, Load(oRows.padfFracCol + i), dy));
+    });
+}
+
+template <typename Method>
+struct RowStagesOf {
+    static constexpr RowStages kStages{nullptr, &RowValues<Method, false>, &RowValues<Method, true>,
+                                       false};
+};
+template <typename Filter>
+struct RowStagesOf<Separable<Filter>> {
+    static constexpr RowStages kStages{&Across<Filter>, &Down<Filter, false>, &Down<Filter, true>,
+                                       Filter::kTabulated};
+};
+// Its replaced samples are another pixel's own: no row holds them.
+template <>
+struct RowStagesOf<CubicPs> {
+    static constexpr RowStages kStages{};
+};

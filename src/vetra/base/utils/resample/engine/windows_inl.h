@@ -1,0 +1,209 @@
+// How a method sees the windows of eight pixels, each in a lane. Included inside a level's
+// namespace; see stages_inl.h.
+//
+// A window offers
+//   Row(k, p)             the first samples of row k, as many as p has elements, an even number
+//   Sample(k, j)          the sample of row k, column j
+//   Get<Parameters>()     what the method prepared for the run
+//   Scratch()             the thread's working memory, as the method asked for
+//   ColumnInput<Filter>(dx) RowInput<Filter>(dy)   what a filter is made from
+//   HasMask() MaskRow(k, p)   source mask bytes, as Row
+
+// Whether samples of this type can make a NaN.
+template <typename T>
+inline constexpr bool kIsFloating = T(0.5) != T(0);
+
+// The size of a method's windows where each run has its own.
+constexpr int kAnySize = 0;
+
+// Of one direction of eight windows, what a filter is made from.
+struct FilterInput {
+    F64 frac;
+    // For a filter with tabulated weights: kLanes of them for each tap.
+    const double* padfTaps;
+    int nTaps;
+};
+
+// The tabulated phase nearest to a fraction. Pixels without a window may have any fraction, NaN
+// included: they too get a phase that exists.
+inline F64 Phase(F64 frac, int nSubPixels, int nLast) {
+    const F64 phase = Floor(frac * Set1(nSubPixels) + Set1(0.5));
+    const F64 atLeast = Select(phase > Set1(0.0), phase, Set1(0.0));
+    const F64 last = Set1(nLast);
+    return Select(atLeast < last, atLeast, last);
+}
+
+// The taps of eight phases from a table that holds them phase by phase.
+inline void GatherTaps(const double* padfTable, int nTaps, F64 phase, double* padfTaps) {
+    std::int64_t anFirst[kLanes];
+    StoreIntegers(anFirst, phase);
+    for (int i = 0; i < kLanes; ++i) {
+        anFirst[i] *= nTaps;
+    }
+    int j = 0;
+    for (; j + 4 <= nTaps; j += 4) {
+        F64 tap[4];
+        GatherQuad(padfTable + j, anFirst, tap);
+        for (int k = 0; k < 4; ++k) {
+            Store(padfTaps + (j + k) * kLanes, tap[k]);
+        }
+    }
+    for (; j < nTaps; ++j) {
+        Store(padfTaps + j * kLanes, Gather(padfTable + j, anFirst));
+    }
+}
+
+inline void GatherAcrossTaps(const KernelTables& oTables, F64 fracCol, double* padfTaps) {
+    const int nSubPixels = oTables.nSubPixels;
+    GatherTaps(oTables.padfAcross, oTables.nCols, Phase(fracCol, nSubPixels, nSubPixels), padfTaps);
+}
+inline void GatherDownTaps(const KernelTables& oTables, F64 fracRow, double* padfTaps) {
+    const int nSubPixels = oTables.nSubPixels;
+    GatherTaps(oTables.padfDown, oTables.nRows, Phase(fracRow, nSubPixels, nSubPixels), padfTaps);
+}
+
+// Windows of source samples, for one channel.
+template <typename T, bool kSingleChannel>
+struct WindowReader {
+    const T* pFirst;
+    const std::int64_t* panOffset;
+    const WindowSpan& oSpan;
+
+    template <int N>
+    void Row(int nRow, F64 (&p)[N]) const {
+        const T* pRow = pFirst + nRow * oSpan.nPitch;
+        if constexpr (kSingleChannel && N % 4 == 0) {
+            for (int j = 0; j < N; j += 4) {
+                GatherQuad(pRow + j, panOffset, reinterpret_cast<F64(&)[4]>(p[j]));
+            }
+        } else {
+            for (int j = 0; j < N; j += 2) {
+                if constexpr (kSingleChannel) {
+                    GatherPair(pRow + j, panOffset, p[j], p[j + 1]);
+                } else {
+                    p[j] = Gather(pRow + j * oSpan.nChan, panOffset);
+                    p[j + 1] = Gather(pRow + (j + 1) * oSpan.nChan, panOffset);
+                }
+            }
+        }
+    }
+
+    F64 Sample(int nRow, int nCol) const {
+        return Gather(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
+                      panOffset);
+    }
+
+    // That sample and the one of the next channel.
+    void ChannelPair(int nRow, int nCol, F64& first, F64& second) const {
+        GatherPair(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
+                   panOffset, first, second);
+    }
+
+    template <typename Parameters>
+    const Parameters& Get() const {
+        return *static_cast<const Parameters*>(oSpan.pParameters);
+    }
+    double* Scratch() const { return oSpan.padfScratch; }
+
+    template <typename Filter>
+    FilterInput ColumnInput(F64 dx) const {
+        if constexpr (Filter::kTabulated) {
+            const KernelTables& oTables = Get<KernelTables>();
+            GatherAcrossTaps(oTables, dx, Scratch());
+            return {dx, Scratch(), oTables.nCols};
+        } else {
+            return {dx, nullptr, Filter::kTaps};
+        }
+    }
+    template <typename Filter>
+    FilterInput RowInput(F64 dy) const {
+        if constexpr (Filter::kTabulated) {
+            const KernelTables& oTables = Get<KernelTables>();
+            // Behind those of the columns.
+            double* padfTaps = Scratch() + oTables.nCols * kLanes;
+            GatherDownTaps(oTables, dy, padfTaps);
+            return {dy, padfTaps, oTables.nRows};
+        } else {
+            return {dy, nullptr, Filter::kTaps};
+        }
+    }
+
+    bool HasMask() const { return oSpan.pabyMask != nullptr; }
+
+    template <int N>
+    void MaskRow(int nRow, F64 (&p)[N]) const {
+        std::int64_t anPixel[kLanes];
+        for (int i = 0; i < kLanes; ++i) {
+            anPixel[i] = panOffset[i] / oSpan.nChan;
+        }
+        const unsigned char* pabyRow = oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan);
+        for (int j = 0; j < N; ++j) {
+            p[j] = Gather(pabyRow + j, anPixel);
+        }
+    }
+};
+
+// The square root of a sample that is greater than 0; 0 for every other one, NaN included.
+inline F64 Root(F64 sample) {
+    const F64 zero = Set1(0.0);
+    return Select(sample > zero, Sqrt(sample), zero);
+}
+
+// The same windows with the roots of their samples.
+template <typename Window>
+struct RootReader {
+    const Window& oWindow;
+
+    template <int N>
+    void Row(int nRow, F64 (&p)[N]) const {
+        oWindow.Row(nRow, p);
+        for (int j = 0; j < N; ++j) {
+            p[j] = Root(p[j]);
+        }
+    }
+    F64 Sample(int nRow, int nCol) const { return Root(oWindow.Sample(nRow, nCol)); }
+    template <typename Parameters>
+    const Parameters& Get() const {
+        return oWindow.template Get<Parameters>();
+    }
+    double* Scratch() const { return oWindow.Scratch(); }
+    template <typename Filter>
+    FilterInput ColumnInput(F64 dx) const {
+        return oWindow.template ColumnInput<Filter>(dx);
+    }
+    template <typename Filter>
+    FilterInput RowInput(F64 dy) const {
+        return oWindow.template RowInput<Filter>(dy);
+    }
+    bool HasMask() const { return oWindow.HasMask(); }
+    template <int N>
+    void MaskRow(int nRow, F64 (&p)[N]) const {
+        oWindow.MaskRow(nRow, p);
+    }
+};
+
+// Windows of rows that are doubles already (and roots, if need be). Columns lie close together
+// where kNear says so.
+template <bool kNear>
+struct RowReader {
+    const RowWindows& oRows;
+    const PickGroup& oGroup;
+
+    F64 Pick(const double* padfRow, int nCol) const {
+        const double* p = padfRow + oGroup.nFirst + nCol;
+        return kNear ? GatherNear(p, oGroup.anOffset) : Gather(p, oGroup.anOffset);
+    }
+
+    template <int N>
+    void Row(int nRow, F64 (&p)[N]) const {
+        for (int j = 0; j < N; ++j) {
+            p[j] = Pick(oRows.papdfRow[nRow], j);
+        }
+    }
+    F64 Sample(int nRow, int nCol) const { return Pick(oRows.papdfRow[nRow], nCol); }
+    template <typename Parameters>
+    const Parameters& Get() const {
+        return *static_cast<const Parameters*>(oRows.pParameters);
+    }
+    double* Scratch() const { return oRows.padfScratch; }
+};
