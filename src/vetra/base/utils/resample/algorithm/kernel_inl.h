@@ -21,6 +21,24 @@ struct KernelFilter {
         return sum;
     }
 
+    // Of a whole row of a window.
+    template <typename Window>
+    F64 RowValue(const Window& oWindow, int nRow) const {
+        F64 sum = Set1(0.0);
+        int j = 0;
+        for (; j + 4 <= nTaps; j += 4) {
+            F64 p[4];
+            oWindow.Quad(nRow, j, p);
+            for (int i = 0; i < 4; ++i) {
+                sum = sum + p[i] * Load(padfTaps + (j + i) * kLanes);
+            }
+        }
+        for (; j < nTaps; ++j) {
+            sum = sum + oWindow.Sample(nRow, j) * Load(padfTaps + j * kLanes);
+        }
+        return sum;
+    }
+
     const double* padfTaps;
     int nTaps;
 };

@@ -16,7 +16,7 @@ struct Separable {
         const Filter oDown(oWindow.template RowInput<Filter>(dy));
         return oDown.Value([&](int k) {
             if constexpr (kSize == kAnySize) {
-                return oAcross.Value([&](int j) { return oWindow.Sample(k, j); });
+                return oAcross.RowValue(oWindow, k);
             } else {
                 F64 p[kSize];
                 oWindow.Row(k, p);

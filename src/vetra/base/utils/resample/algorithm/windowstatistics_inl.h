@@ -9,7 +9,13 @@ struct Average {
         const WindowSize& oSize = oWindow.template Get<WindowSize>();
         F64 sum = Set1(0.0);
         for (int k = 0; k < oSize.nRows; ++k) {
-            for (int j = 0; j < oSize.nCols; ++j) {
+            int j = 0;
+            for (; j + 4 <= oSize.nCols; j += 4) {
+                F64 p[4];
+                oWindow.Quad(k, j, p);
+                sum = sum + p[0] + p[1] + p[2] + p[3];
+            }
+            for (; j < oSize.nCols; ++j) {
                 sum = sum + oWindow.Sample(k, j);
             }
         }

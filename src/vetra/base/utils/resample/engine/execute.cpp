@@ -78,6 +78,22 @@ struct ValueArrays {
     double* padfScratch = nullptr;
 };
 
+// Roots of all samples of the types 8U and 8S, by their bits; 0 for negative ones.
+struct RootTables {
+    RootTables() {
+        for (int i = 0; i < 256; ++i) {
+            adf[0][i] = std::sqrt(static_cast<double>(i));
+            adf[1][i] = i < 128 ? adf[0][i] : 0.0;
+        }
+    }
+    double adf[2][256];
+};
+
+const RootTables& GetRoots() {
+    static const RootTables kRoots;
+    return kRoots;
+}
+
 unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
     // Mostly they are all the same: every byte equals the one behind it.
     if (std::memcmp(pabyMode, pabyMode + 1, static_cast<std::size_t>(nPix) - 1) == 0) {
@@ -141,6 +157,7 @@ class Run {
     const Task& moTask;
     const Method& moMethod;
     const LevelStages& moStages;
+    const RootTables& moRoots;
     Positions moPositions;
     ModeTable moModes;
     ClassLimits moLimits;
@@ -161,6 +178,7 @@ Run::Run(const Task& oTask)
     : moTask(oTask),
       moMethod(*oTask.poMethod),
       moStages(GetStages(oTask.oOptions.eLevel)),
+      moRoots(GetRoots()),
       moPositions(*oTask.poTfm),
       moModes(moMethod.eRule, oTask.eFillAction),
       mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
@@ -199,7 +217,7 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
     const Window& oWindow = moMethod.oWindow;
     // Where no window fits none is computed, and its size is only a number.
     if (oWindow.nCols <= moTask.nSrcCols && oWindow.nRows <= moTask.nSrcRows) {
-        if (!moRowPlan.IsEmpty()) {
+        if (moRowPlan.GetKind() != RowKind::eNone) {
             oMemory.poRows = std::make_unique<RowCache>(moTask, moRowPlan);
         } else if (moMethod.eScratch != Scratch::eNone) {
             oMemory.padfScratch.reset(new double[GetScratchSize(moMethod)]);
@@ -416,6 +434,8 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.pabyMask = oSpan.pabyWindowMask;
     oWindows.pParameters = moTask.pParameters;
     oWindows.padfScratch = oValues.padfScratch;
+    oWindows.padfRoots[0] = moRoots.adf[0];
+    oWindows.padfRoots[1] = moRoots.adf[1];
     for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
         double* padfValue = oValues.adfValue;
         if (bWindows && oSpan.poRows != nullptr) {

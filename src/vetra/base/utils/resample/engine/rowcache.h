@@ -17,6 +17,18 @@ struct Strip {
     int nNumCols = 0;
     std::int64_t nSrcFirst = 0;
     std::int64_t nSrcCount = 0;  ///< 0 where no window fits
+    /// The target columns whose windows fit, where they are neighbours.
+    int nFitFirst = 0;
+    int nFitCount = 0;
+};
+
+/// What is kept of the source's rows.
+enum class RowKind {
+    eNone,      ///< nothing: each window reads the source
+    eDoubles,   ///< samples, or their roots, as doubles
+    eFiltered,  ///< what a separable method makes of those along the columns
+    eSums,      ///< sums of integers over the rows of a window, added up along the columns
+    eMedians,   ///< nothing; but the windows are those of neighbours, and read together
 };
 
 /// Target columns cut into strips, whose rows of doubles stay in the cache while the target rows
@@ -28,28 +40,32 @@ class RowPlan {
     RowPlan() = default;
     RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTables& oColumns);
 
-    bool IsEmpty() const { return mvoStrips.empty(); }
+    RowKind GetKind() const { return meKind; }
     const std::vector<Strip>& GetStrips() const { return mvoStrips; }
 
  private:
     friend class RowCache;
 
-    bool MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nStripCols);
+    void MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nStripCols);
+    RowKind ChooseKind(const Task& oTask) const;
+    bool SumsAreExact(const Task& oTask) const;
+    double GetRowBytes(const Task& oTask) const;
 
+    RowKind meKind = RowKind::eNone;
     const LevelStages* mpoStages = nullptr;
     const RowStages* mpoRows = nullptr;
     bool mbSquared = false;
     int mnStripCols = 0;
     std::int64_t mnWidest = 0;  ///< source columns of a strip
+    bool mbReduces = false;     ///< most source columns are in no window
+    bool mbUnitSteps = false;   ///< each window begins one column behind the one before
     std::vector<Strip> mvoStrips;
     /// Counted from the first source column of the group's strip.
     std::vector<PickGroup> mvoGroups;
     const double* mpadfFracCol = nullptr;
 };
 
-/// The rows of doubles that a thread keeps: as many as a window has rows, of all channels. They are
-/// source samples, roots of those, or, for separable methods, what a row's samples make along the
-/// columns.
+/// What a thread keeps of the source's rows, for all channels.
 class RowCache {
  public:
     /// Allocates all that it needs. Throws std::bad_alloc.
@@ -65,6 +81,9 @@ class RowCache {
 
  private:
     void Fetch(std::int64_t nSrcRow, std::size_t nSlot);
+    void MoveSums(std::int64_t nSrcRow);
+    void ComputeMedians(int nFirstCol, int nNumCols);
+    const char* SrcSamples(std::int64_t nSrcRow, int nChannel) const;
 
     const Task& moTask;
     const RowPlan& moPlan;
@@ -79,6 +98,10 @@ class RowCache {
     std::unique_ptr<double[]> mpadfScratch;
     std::vector<std::int64_t> mvnSrcRow;  // which is in each slot
     std::vector<const double*> mvpadfRow;
+    std::int64_t mnWindowRow = -1;
+    std::unique_ptr<char[]> mpabyCopy;  // for medians
+    std::vector<const void*> mvpRow;
+    std::vector<const void*> mvpCopy;
     alignas(64) double madfValue[kSpanArray + kLanes] = {};
 };
 

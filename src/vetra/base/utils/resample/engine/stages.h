@@ -99,6 +99,8 @@ struct WindowSpan {
     int nChan;
     /// What the method prepared for the run; may be null.
     const void* pParameters;
+    /// Roots of the 256 samples of the types 8U and 8S, by their bits.
+    const double* padfRoots[2];
     /// The thread's own working memory, as much as the method asked for; null if it didn't.
     double* padfScratch;
 };
@@ -129,6 +131,18 @@ struct ComplexKernelTables {
     int nPhases;
 };
 
+/// Windows at unit scale of a stretch of one target row, over rows of the source.
+struct MedianRows {
+    /// Of the windows, in order; they begin at the first pixel's window.
+    const void* const* papRow;
+    /// Room for as many rows, each of the window's columns and kMedianReach samples.
+    void* pCopy;
+    const void** papCopy;
+};
+constexpr int kMedianReach = 64;
+/// The largest window whose samples the medians stage can count.
+constexpr int kMostMedianSamples = 65535;
+
 /// What a store stage knows of the output type's clamp.
 template <typename T>
 struct StoreLimits {
@@ -151,6 +165,12 @@ using AcrossFunction = void (*)(const RowWindows& oRows, const double* padfRow,
                                 double* padfFiltered);
 /// Computes the values of all pixels of oRows.
 using RowValuesFunction = void (*)(const RowWindows& oRows, double* padfValue);
+/// Adds a stretch of one channel of a source row to sums, or takes it away: nCount samples, nChan
+/// apart.
+using AddRowFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum);
+/// Computes the medians of nPix windows at unit scale.
+using MediansFunction = void (*)(const MedianRows& oRows, const WindowSize& oSize, int nPix,
+                                 double* padfValue);
 /// Reads the samples at panOffset of the pixels whose mode is 2.
 using NearestFunction = void (*)(const void* pSrc, const std::int64_t* panOffset,
                                  const unsigned char* pabyMode, int nPix, double* padfValue);
@@ -245,6 +265,15 @@ struct LevelStages {
     /// The taps of a row's groups, by which rows are filtered.
     void (*pfnColumnTaps)(const void* pParameters, const double* padfFracCol, int nPix,
                           double* padfTaps);
+    /// Means of integers: rows are added to the sums of columns, or taken away; those are added up
+    /// from the left, n + 1 of them; the last stage takes what it needs of them as one row.
+    AddRowFunction apfnAddRow[kNumSampleTypes];
+    AddRowFunction apfnSubtractRow[kNumSampleTypes];
+    void (*pfnAddUp)(const double* padfSum, std::int64_t nCount, double* padfTotal);
+    RowValuesFunction pfnSumValues;
+    /// Medians, and squared ones; null for most types.
+    MediansFunction apfnMedians[kNumSampleTypes];
+    MediansFunction apfnSquaredMedians[kNumSampleTypes];
     /// By the half of a row's number, which it shares with its squared twin.
     RowStages aoRows[(kNumValues - 1) / 2];
     NearestFunction apfnNearest[kNumSampleTypes];

@@ -53,6 +53,8 @@ namespace {
 #include "vetra/base/utils/resample/algorithm/windowstatistics_inl.h"
 #include "vetra/base/utils/resample/engine/values_inl.h"
 #include "vetra/base/utils/resample/engine/rows_inl.h"
+#include "vetra/base/utils/resample/engine/sums_inl.h"
+#include "vetra/base/utils/resample/engine/medians_inl.h"
 #include "vetra/base/utils/resample/engine/stores_inl.h"
 // clang-format on
 
@@ -72,6 +74,11 @@ namespace {
         Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), \
             Entry(unsigned int), Entry(int), nullptr, nullptr, nullptr, nullptr        \
     }
+#define VETRA_PER_SMALL_INTEGER(Entry)                                                  \
+    {                                                                                   \
+        Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), \
+            nullptr, nullptr, nullptr, nullptr, nullptr, nullptr                        \
+    }
 #define VETRA_VALUES(Method, T) &Values<Method, T>
 #define VETRA_COMPLEX_VALUES(Method, T) &ComplexValues<Method, T>
 #define VETRA_TWINS(Name, Method) \
@@ -79,6 +86,10 @@ namespace {
 #define VETRA_ROWS(Name, Method) RowStagesOf<Method>::kStages,
 #define VETRA_WIDEN(T) &Widen<T, false>
 #define VETRA_WIDEN_ROOTS(T) &Widen<T, true>
+#define VETRA_ADD_ROW(T) &AddRow<T, true>
+#define VETRA_SUBTRACT_ROW(T) &AddRow<T, false>
+#define VETRA_MEDIANS(T) &Medians<T, false>
+#define VETRA_SQUARED_MEDIANS(T) &Medians<T, true>
 #define VETRA_NEAREST(T) &NearestValues<T, false>
 #define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
@@ -102,6 +113,12 @@ const LevelStages kStages = {
     VETRA_PER_TYPE(VETRA_WIDEN),
     VETRA_PER_TYPE(VETRA_WIDEN_ROOTS),
     &ColumnTaps,
+    VETRA_PER_TYPE(VETRA_ADD_ROW),
+    VETRA_PER_TYPE(VETRA_SUBTRACT_ROW),
+    &AddUp,
+    &SumValues,
+    VETRA_PER_SMALL_INTEGER(VETRA_MEDIANS),
+    VETRA_PER_SMALL_INTEGER(VETRA_SQUARED_MEDIANS),
     {VETRA_VALUES_ROWS(VETRA_ROWS)},
     VETRA_PER_TYPE(VETRA_NEAREST),
     VETRA_PER_TYPE(VETRA_NONNEGATIVE),

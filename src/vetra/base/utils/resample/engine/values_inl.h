@@ -78,4 +78,3 @@ void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsign
         }
     }
 }
-

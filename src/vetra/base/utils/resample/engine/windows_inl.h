@@ -3,6 +3,7 @@
 //
 // A window offers
 //   Row(k, p)             the first samples of row k, as many as p has elements, an even number
+//   Quad(k, j, p)         the samples of row k, columns j to j + 3
 //   Sample(k, j)          the sample of row k, column j
 //   Get<Parameters>()     what the method prepared for the run
 //   Scratch()             the thread's working memory, as the method asked for
@@ -62,6 +63,9 @@ inline void GatherDownTaps(const KernelTables& oTables, F64 fracRow, double* pad
     GatherTaps(oTables.padfDown, oTables.nRows, Phase(fracRow, nSubPixels, nSubPixels), padfTaps);
 }
 
+template <typename T>
+inline constexpr int kIsSigned8 = T(-1) < T(0) ? 1 : 0;
+
 // Windows of source samples, for one channel.
 template <typename T, bool kSingleChannel>
 struct WindowReader {
@@ -71,32 +75,50 @@ struct WindowReader {
 
     template <int N>
     void Row(int nRow, F64 (&p)[N]) const {
-        const T* pRow = pFirst + nRow * oSpan.nPitch;
-        if constexpr (kSingleChannel && N % 4 == 0) {
-            for (int j = 0; j < N; j += 4) {
-                GatherQuad(pRow + j, panOffset, reinterpret_cast<F64(&)[4]>(p[j]));
-            }
-        } else {
-            for (int j = 0; j < N; j += 2) {
-                if constexpr (kSingleChannel) {
-                    GatherPair(pRow + j, panOffset, p[j], p[j + 1]);
-                } else {
-                    p[j] = Gather(pRow + j * oSpan.nChan, panOffset);
-                    p[j + 1] = Gather(pRow + (j + 1) * oSpan.nChan, panOffset);
-                }
+        int j = 0;
+        for (; j + 4 <= N; j += 4) {
+            Quad(nRow, j, reinterpret_cast<F64(&)[4]>(p[j]));
+        }
+        for (; j < N; j += 2) {
+            if constexpr (kSingleChannel) {
+                GatherPair(At(nRow, j), panOffset, p[j], p[j + 1]);
+            } else {
+                p[j] = Sample(nRow, j);
+                p[j + 1] = Sample(nRow, j + 1);
             }
         }
     }
 
-    F64 Sample(int nRow, int nCol) const {
-        return Gather(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
-                      panOffset);
+    void Quad(int nRow, int nCol, F64 (&p)[4]) const {
+        if constexpr (kSingleChannel) {
+            GatherQuad(At(nRow, nCol), panOffset, p);
+        } else {
+            for (int j = 0; j < 4; ++j) {
+                p[j] = Sample(nRow, nCol + j);
+            }
+        }
+    }
+
+    F64 Sample(int nRow, int nCol) const { return Gather(At(nRow, nCol), panOffset); }
+
+    // Its root: of 8-bit samples there is a table, since a root takes longer than reading one.
+    static constexpr bool kHasRoots = sizeof(T) == 1;
+    F64 SampleRoot(int nRow, int nCol) const {
+        const T* p = At(nRow, nCol);
+        std::int64_t anPlace[kLanes];
+        for (int i = 0; i < kLanes; ++i) {
+            anPlace[i] = static_cast<unsigned char>(p[panOffset[i]]);
+        }
+        return Gather(oSpan.padfRoots[kIsSigned8<T>], anPlace);
     }
 
     // That sample and the one of the next channel.
     void ChannelPair(int nRow, int nCol, F64& first, F64& second) const {
-        GatherPair(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
-                   panOffset, first, second);
+        GatherPair(At(nRow, nCol), panOffset, first, second);
+    }
+
+    const T* At(int nRow, int nCol) const {
+        return pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan;
     }
 
     template <typename Parameters>
@@ -156,12 +178,36 @@ struct RootReader {
 
     template <int N>
     void Row(int nRow, F64 (&p)[N]) const {
-        oWindow.Row(nRow, p);
-        for (int j = 0; j < N; ++j) {
-            p[j] = Root(p[j]);
+        if constexpr (Window::kHasRoots) {
+            for (int j = 0; j < N; ++j) {
+                p[j] = oWindow.SampleRoot(nRow, j);
+            }
+        } else {
+            oWindow.Row(nRow, p);
+            for (int j = 0; j < N; ++j) {
+                p[j] = Root(p[j]);
+            }
         }
     }
-    F64 Sample(int nRow, int nCol) const { return Root(oWindow.Sample(nRow, nCol)); }
+    void Quad(int nRow, int nCol, F64 (&p)[4]) const {
+        if constexpr (Window::kHasRoots) {
+            for (int j = 0; j < 4; ++j) {
+                p[j] = oWindow.SampleRoot(nRow, nCol + j);
+            }
+        } else {
+            oWindow.Quad(nRow, nCol, p);
+            for (int j = 0; j < 4; ++j) {
+                p[j] = Root(p[j]);
+            }
+        }
+    }
+    F64 Sample(int nRow, int nCol) const {
+        if constexpr (Window::kHasRoots) {
+            return oWindow.SampleRoot(nRow, nCol);
+        } else {
+            return Root(oWindow.Sample(nRow, nCol));
+        }
+    }
     template <typename Parameters>
     const Parameters& Get() const {
         return oWindow.template Get<Parameters>();
@@ -198,6 +244,11 @@ struct RowReader {
     void Row(int nRow, F64 (&p)[N]) const {
         for (int j = 0; j < N; ++j) {
             p[j] = Pick(oRows.papdfRow[nRow], j);
+        }
+    }
+    void Quad(int nRow, int nCol, F64 (&p)[4]) const {
+        for (int j = 0; j < 4; ++j) {
+            p[j] = Pick(oRows.papdfRow[nRow], nCol + j);
         }
     }
     F64 Sample(int nRow, int nCol) const { return Pick(oRows.papdfRow[nRow], nCol); }
