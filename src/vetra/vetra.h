@@ -4,6 +4,8 @@
 /// Every public header.
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
+#include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
+#include "vetra/base/utils/resample/algorithm/cplxsarresampler.h"
 #include "vetra/base/utils/resample/algorithm/cubicpsresampler.h"
 #include "vetra/base/utils/resample/algorithm/cubicresampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange4resampler.h"

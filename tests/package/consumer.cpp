@@ -59,10 +59,16 @@ int main() {
         std::make_unique<Lagrange8Resampler>(),   std::make_unique<SqLagrange8Resampler>(),
         std::make_unique<AverageResampler>(1, 1), std::make_unique<SqAverageResampler>(1, 1),
         std::make_unique<MedianResampler>(1, 1),  std::make_unique<SqMedianResampler>(1, 1),
-        std::make_unique<SqNearestResampler>()};
+        std::make_unique<SqNearestResampler>(),   std::make_unique<CplxSarResampler>(1, 1, 0.0)};
     for (const auto& poResampler : apoResamplers) {
         Check(BlockPlanner(oArray, 3, 1, *poResampler, 1, 1).GetNumBlocks() == 1, "blocks");
     }
+    double *padfAcross, *padfReal, *padfImag;
+    GetCplxSarCoeffs(1, 1, 0.0, 1, padfAcross, padfReal, padfImag);
+    Check(padfAcross[0] == 1.0 && padfReal[0] == 1.0 && padfImag[0] == 0.0, "complex SAR taps");
+    delete[] padfAcross;
+    delete[] padfReal;
+    delete[] padfImag;
     float fClamped = 0.0f;
     std::unique_ptr<PixelClamp<float>>(PixelClampFactory::Create<float>(0.0, 1.0, 0.5, true))
         ->Clamp(7.0, &fClamped);

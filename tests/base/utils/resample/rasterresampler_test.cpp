@@ -79,6 +79,9 @@ TEST(RasterResampler, AllClasses) {
     CheckClass<NearestResampler>(3, kOne, {});
     CheckClass<AverageResampler>(6, kThreeFive, oWindow, 3, 5);
     CheckClass<MedianResampler>(7, kThreeFive, oWindow, 3, 5);
+    CheckClass<CplxSarResampler>(
+        8, {-2, -3, 5, 7, 1, 1, -2, -3, 3, 4},
+        {{"NUMCOLS", "5"}, {"NUMROWS", "7"}, {"FC", "  2.5000000000000000e-01"}}, 5, 7, 0.25);
     CheckClass<Lagrange4Resampler>(9, kFour, {});
     CheckClass<Lagrange8Resampler>(10, kEight, {});
     CheckClass<SqBilinearResampler>(13, kTwo, {});
@@ -111,6 +114,32 @@ TEST(RasterResampler, WindowSizes) {
     CheckWindowSizes<MedianResampler>("median", 0, "");
     CheckWindowSizes<SqMedianResampler>("median", 12, ", max 11");
     MedianResampler(12, 3);
+}
+
+TEST(RasterResampler, CplxSar) {
+    for (const double dfFc : {-0.5, -1.0 / 3.0, 0.0, 0.5}) {
+        int nCols = 0, nRows = 0;
+        double dfRead = 7.0;
+        CplxSarResampler(31, 1, dfFc).GetParameters(nCols, nRows, dfRead);
+        EXPECT_TRUE(nCols == 31 && nRows == 1 && dfRead == dfFc) << dfFc;
+    }
+    for (const int nSize : {0, -3, 6, 32, 33}) {
+        const std::string sSize = std::to_string(nSize);
+        const std::string sRest = "for complex SAR resampler must be a positive odd number, max 31";
+        ExpectRefusal({"nWndNumCols", 1, sSize, "Positive odd number", "Num cols " + sRest},
+                      [&] { CplxSarResampler(nSize, nSize, 0.6); });
+        ExpectRefusal({"nWndNumRows", 1, sSize, "Positive odd number", "Num rows " + sRest},
+                      [&] { CplxSarResampler(7, nSize, 0.6); });
+    }
+    for (const double dfFc : {-0.75, 0.6}) {
+        const std::string sFc = FormatString("%f", dfFc);
+        ExpectRefusal(
+            {"dfFc", 1, sFc, "[-0.5, 0.5]",
+             "The given central frequency (" + sFc + ") must fall in the range [-0.5, 0.5]"},
+            [&] { CplxSarResampler(5, 7, dfFc); });
+    }
+    EXPECT_THROW(CplxSarResampler(5, 7, std::numeric_limits<double>::quiet_NaN()),
+                 ParameterException);
 }
 
 // A caller's own class, whose axes have different anchors.

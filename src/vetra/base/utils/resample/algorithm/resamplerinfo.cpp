@@ -17,22 +17,60 @@ CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows) {
             {"NUMROWS", FormatString("%d", nWndNumRows)}};
 }
 
-void CheckWindowSize(int nWndNumCols, int nWndNumRows, const char* pszWhat, int nMax,
-                     const char* pszFile, const char* pszFunction, std::uint32_t nLine) {
+namespace {
+
+struct SizeRule {
+    const char* pszWhat;
+    const char* pszExpected;
+    const char* pszKind;
+    int nMax;
+    bool bOdd;
+};
+
+void CheckSizes(int nWndNumCols, int nWndNumRows, const SizeRule& oRule, const char* pszFile,
+                const char* pszFunction, std::uint32_t nLine) {
     const auto fnCheck = [&](int nSize, const char* pszArgument, const char* pszAxis) {
-        if (nSize < 1 || nSize > nMax) {
+        if (nSize < 1 || nSize > oRule.nMax || (oRule.bOdd && nSize % 2 == 0)) {
             std::string sMessage =
-                FormatString("Num %s for %s must be a positive number", pszAxis, pszWhat);
-            if (nMax != kNoLimit) {
-                sMessage += FormatString(", max %d", nMax);
+                FormatString("Num %s for %s must be a %s", pszAxis, oRule.pszWhat, oRule.pszKind);
+            if (oRule.nMax != kNoLimit) {
+                sMessage += FormatString(", max %d", oRule.nMax);
             }
             throw ParameterException(pszArgument, ParameterException::eInvalid,
-                                     FormatString("%d", nSize), "Positive number", sMessage,
+                                     FormatString("%d", nSize), oRule.pszExpected, sMessage,
                                      pszFile, pszFunction, nLine);
         }
     };
     fnCheck(nWndNumCols, "nWndNumCols", "cols");
     fnCheck(nWndNumRows, "nWndNumRows", "rows");
+}
+
+}  // namespace
+
+void CheckWindowSize(int nWndNumCols, int nWndNumRows, const char* pszWhat, int nMax,
+                     const char* pszFile, const char* pszFunction, std::uint32_t nLine) {
+    CheckSizes(nWndNumCols, nWndNumRows,
+               {pszWhat, "Positive number", "positive number", nMax, false}, pszFile, pszFunction,
+               nLine);
+}
+
+void CheckCplxSarSize(int nWndNumCols, int nWndNumRows, const char* pszFile,
+                      const char* pszFunction, std::uint32_t nLine) {
+    CheckSizes(nWndNumCols, nWndNumRows,
+               {"complex SAR resampler", "Positive odd number", "positive odd number", 31, true},
+               pszFile, pszFunction, nLine);
+}
+
+void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunction,
+                           std::uint32_t nLine) {
+    // A NaN is outside too.
+    if (!(dfFc >= -0.5 && dfFc <= 0.5)) {
+        throw ParameterException(
+            "dfFc", ParameterException::eInvalid, FormatString("%lf", dfFc), "[-0.5, 0.5]",
+            FormatString("The given central frequency (%lf) must fall in the range [-0.5, 0.5]",
+                         dfFc),
+            pszFile, pszFunction, nLine);
+    }
 }
 
 }  // namespace vetra::utils

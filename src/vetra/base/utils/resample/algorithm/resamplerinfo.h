@@ -22,6 +22,14 @@ constexpr int kNoLimit = std::numeric_limits<int>::max();
 void CheckWindowSize(int nWndNumCols, int nWndNumRows, const char* pszWhat, int nMax,
                      const char* pszFile, const char* pszFunction, std::uint32_t nLine);
 
+/// As `CheckWindowSize`, for the window of complex SAR sampling: odd sizes from 1 to 31.
+void CheckCplxSarSize(int nWndNumCols, int nWndNumRows, const char* pszFile,
+                      const char* pszFunction, std::uint32_t nLine);
+
+/// Refuses a central frequency outside -0.5 to 0.5, with `ParameterException`.
+void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunction,
+                           std::uint32_t nLine);
+
 }  // namespace vetra::utils
 
 #endif  // VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLERINFO_H
