@@ -7,7 +7,7 @@
 #include <vector>
 
 #include "gdalraster/errors.h"
-#include "methods.h"
+#include "methodscommand.h"
 #include "rasterjob/interrupt.h"
 #include "resamplecommand.h"
 #include "vetra/base/utils/string/stringutils.h"
@@ -50,9 +50,7 @@ int Run(int nArgs, char** papszArgs) {
     oApp.set_version_flag("--version", "vetra " VETRA_VERSION);
     oApp.require_subcommand(1);
     AddResampleCommand(oApp);
-    oApp.add_subcommand("methods", "List the resampling methods.")->callback([] {
-        std::fputs(DescribeMethods().c_str(), stdout);
-    });
+    AddMethodsCommand(oApp);
     try {
         oApp.parse(CompletePairs(nArgs, papszArgs));
     } catch (const CLI::Success& oHelp) {

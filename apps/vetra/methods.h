@@ -8,8 +8,8 @@
 
 namespace vetra::tool {
 
-/// A resampler by the name of its method, in any case.
-/// \throws UsageError for a name that is none, or whose method needs parameters.
+/// A resampler from a resampler string, for instance "AVERAGE,NUMCOLS=3,NUMROWS=3".
+/// \throws UsageError for a string that the library refuses, and for an empty one.
 std::unique_ptr<utils::IRasterResampler> MakeResampler(const std::string& sMethod);
 
 /// Whether a method gives samples of the source as they are.
@@ -20,8 +20,19 @@ bool IsNearest(const utils::IRasterResampler& oResampler);
 void RunOnePixel(const utils::ResampleInfo& oInfo, gobs::NativeDataTypeCode eSrcType,
                  gobs::NativeDataTypeCode eTgtType);
 
-/// A table of all methods for a user to read.
+/// A method's window and margins for a user to read.
+struct WindowText {
+    std::string sWindow;   ///< columns x rows
+    std::string sMargins;  ///< left, top, right, bottom
+};
+WindowText DescribeWindow(const utils::IRasterResampler& oResampler);
+
+/// All methods with their keys, for a user to read.
 std::string DescribeMethods();
+
+/// The method that a resampler string makes: its coefficients, window and margins.
+/// \throws UsageError as `MakeResampler`.
+std::string DescribeMethod(const std::string& sMethod);
 
 }  // namespace vetra::tool
 

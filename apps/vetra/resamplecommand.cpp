@@ -2,6 +2,7 @@
 
 #include <cpl_string.h>
 
+#include <algorithm>
 #include <limits>
 #include <memory>
 #include <string>
@@ -11,6 +12,7 @@
 #include "gdalraster/pixeltypes.h"
 #include "methods.h"
 #include "rasterjob/resamplejob.h"
+#include "vetra/base/utils/string/stringutils.h"
 
 namespace vetra::tool {
 
@@ -27,7 +29,9 @@ struct Texts {
     std::string sType;
     std::string sNodata;
     std::string sTargetNodata;
-    std::string sFill = "nn";
+    std::string sFill;
+    int nDownsample = 0;
+    std::string sMethod;
 };
 
 GridRequest ToPair(GridRequest::Kind eKind, const char* pszOption,
@@ -52,8 +56,25 @@ std::optional<NodataValue> ToNodata(const char* pszOption, const std::string& sT
     return oNodata;
 }
 
+// The method of a reduction by a factor: its sizes are the factor unless the string has its own, of
+// which the last counts.
+std::string WithFactor(const std::string& sMethod, int nFactor) {
+    const std::string sFactor = std::to_string(nFactor);
+    const std::size_t nEnd = std::min(sMethod.find(','), sMethod.size());
+    return sMethod.substr(0, nEnd) + ",NUMCOLS=" + sFactor + ",NUMROWS=" + sFactor +
+           ",DSFACTORCOL=" + sFactor + sMethod.substr(nEnd);
+}
+
 void Interpret(const Texts& oTexts, ResampleOptions& oOptions) {
-    if (!oTexts.oSize.empty()) {
+    if (!oTexts.sMethod.empty()) {
+        oOptions.sMethod = oTexts.sMethod;
+    }
+    if (oTexts.nDownsample > 0) {
+        oOptions.oGrid = {GridRequest::eGK_FACTOR, static_cast<double>(oTexts.nDownsample),
+                          static_cast<double>(oTexts.nDownsample)};
+        oOptions.sMethod =
+            WithFactor(oTexts.sMethod.empty() ? "AVERAGE" : oTexts.sMethod, oTexts.nDownsample);
+    } else if (!oTexts.oSize.empty()) {
         oOptions.oGrid = {GridRequest::eGK_SIZE, static_cast<double>(oTexts.oSize[0]),
                           static_cast<double>(oTexts.oSize[1])};
     } else if (!oTexts.oScale.empty()) {
@@ -69,7 +90,9 @@ void Interpret(const Texts& oTexts, ResampleOptions& oOptions) {
     }
     oOptions.oNodata = ToNodata("--nodata", oTexts.sNodata);
     oOptions.oTargetNodata = ToNodata("--dst-nodata", oTexts.sTargetNodata);
-    oOptions.eFill = EQUAL(oTexts.sFill.c_str(), "bgd") ? utils::eNFA_BGD : utils::eNFA_NN;
+    if (!oTexts.sFill.empty()) {
+        oOptions.eFill = EQUAL(oTexts.sFill.c_str(), "bgd") ? utils::eNFA_BGD : utils::eNFA_NN;
+    }
     for (const std::string& sOption : oOptions.oCreationOptions) {
         if (sOption.find('=', 1) == std::string::npos) {
             throw UsageError("--co: " + sOption + " is not of the form NAME=VALUE");
@@ -124,8 +147,18 @@ void AddResampleCommand(CLI::App& oApp) {
         "Size of a target pixel in georeferenced units, kept exactly")
         ->expected(2);
 
-    Add(poCommand, "--method", poOptions->sMethod, "NAME",
-        "The method, BILIN by default; vetra methods lists them");
+    Add(poGrid, "--downsample", poTexts->nDownsample, "N",
+        "A target pixel for N x N source pixels: their mean, or their median with\n"
+        "--method MEDIAN, or what the method makes of them. N is also the size of\n"
+        "the window and the factor of GAUSSIAN, unless the method has its own")
+        ->check(Plain(CLI::Range(1, std::numeric_limits<int>::max())));
+
+    Add(poCommand, "--method", poTexts->sMethod, "NAME[,KEY=VALUE...]",
+        "The method, BILIN by default, with its keys, for instance\n"
+        "SINC8,SHAPINGWINDOW=LANCZOS; vetra methods lists all")
+        ->check([](const std::string& s) {
+            return TrimWhitespace(s).empty() ? std::string("no method is given") : std::string();
+        });
     Add(poCommand, "--type", poTexts->sType, "TYPE",
         "Pixel type of the target, that of the source by default; one of\n" + GetPixelTypeNames());
     Add(poCommand, "--nodata", poTexts->sNodata, "VALUE",

@@ -48,6 +48,12 @@ Grid PlanGrid(GDALDataset& oSource, const GridRequest& oRequest) {
         }
         oGrid.dfColScale = oRequest.dfX / dfSrcX;
         oGrid.dfRowScale = oRequest.dfY / dfSrcY;
+    } else if (oRequest.eKind == GridRequest::eGK_FACTOR) {
+        oGrid.dfColScale = oRequest.dfX;
+        oGrid.dfRowScale = oRequest.dfY;
+    }
+    if (oRequest.eKind == GridRequest::eGK_RESOLUTION ||
+        oRequest.eKind == GridRequest::eGK_FACTOR) {
         oGrid.nCols = FillSource(nSrcCols, oGrid.dfColScale, "columns");
         oGrid.nRows = FillSource(nSrcRows, oGrid.dfRowScale, "rows");
     } else {

@@ -14,6 +14,7 @@ struct GridRequest {
         eGK_SIZE,        ///< columns and rows
         eGK_SCALE,       ///< target pixels per source pixel
         eGK_RESOLUTION,  ///< pixel size in georeferenced units
+        eGK_FACTOR,      ///< source pixels per target pixel
     };
     Kind eKind = eGK_SIZE;
     double dfX = 1.0;
@@ -34,9 +35,9 @@ struct Grid {
 };
 
 /// Size and scale cover the source exactly; a scale rounds to whole pixels, at least one. A
-/// resolution is kept to the last digit: columns and rows are rounded so that every target pixel
-/// has its centre inside the source, which leaves out, or reaches over, at most half a target
-/// pixel.
+/// resolution and a factor are kept to the last digit: columns and rows are rounded so that every
+/// target pixel has its centre inside the source, which leaves out, or reaches over, at most half a
+/// target pixel.
 /// \throws RunError for a target without pixels or with more than a file can hold, and for a
 ///         resolution where the source has no georeference.
 Grid PlanGrid(GDALDataset& oSource, const GridRequest& oRequest);

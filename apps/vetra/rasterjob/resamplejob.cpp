@@ -33,10 +33,34 @@ constexpr long long kSmallestBlock = 8 * kMegabyte;
 // Share of the progress that a run has where another format is made from its result.
 constexpr double kStageShare = 0.8;
 
+// How far a position moves so that a method's window lies around it. The windows of means and
+// medians start at the pixel nearest to a position; left there, images would move by half a window.
+struct WindowShift {
+    explicit WindowShift(const IRasterResampler& oResampler) {
+        int nColOff, nRowOff, nCols, nRows;
+        utils::WindowAnchorPoint eColAnchor, eRowAnchor;
+        oResampler.GetWindowExtents(nColOff, nRowOff, nCols, nRows, eColAnchor, eRowAnchor);
+        if (eColAnchor == utils::eWAP_NEAREST) {
+            dfCols = -(nColOff + (nCols - 1) / 2.0);
+        }
+        if (eRowAnchor == utils::eWAP_NEAREST) {
+            dfRows = -(nRowOff + (nRows - 1) / 2.0);
+        }
+    }
+
+    bool IsNone() const { return dfCols == 0.0 && dfRows == 0.0; }
+
+    double dfCols = 0.0;
+    double dfRows = 0.0;
+};
+
 // What the blocks of a run have in common.
 struct RunPlan {
     TargetPlan oTarget;
     std::unique_ptr<IRasterResampler> poResampler;
+    // Pixels without a whole window are filled in a second run, from where they are and not from
+    // where their window starts.
+    bool bFillApart = false;
     bool bJoined = false;       // all bands are channels of one run
     bool bExactNodata = false;  // the nodata value is stored after the run, not by it
 };
@@ -113,12 +137,19 @@ RunPlan MakePlan(const ResampleOptions& oOptions, SourceRaster& oSource) {
             "interpolated: use --method NEAR, or expand the palette first (gdal_translate -expand "
             "rgb)");
     }
-    oPlan.poResampler->SetNodataFillAction(oOptions.eFill);
+    if (oOptions.eFill) {
+        oPlan.poResampler->SetNodataFillAction(*oOptions.eFill);
+    }
     oPlan.bExactNodata = oTarget.oNodata && oTarget.oNodata->NeedsExactStore(oTarget.eType);
     const bool bBackground = oTarget.oNodata && !oPlan.bExactNodata;
     oPlan.poResampler->SetClampBgdFlag(bBackground);
     oPlan.poResampler->SetOutBgd(bBackground ? oTarget.oNodata->AsDouble() : 0.0);
     CheckEngine(oOptions.sMethod, *oPlan.poResampler, oSource, oTarget.eType);
+    oPlan.bFillApart = oPlan.poResampler->GetNodataFillAction() == utils::eNFA_NN &&
+                       !WindowShift(*oPlan.poResampler).IsNone();
+    if (oPlan.bFillApart) {
+        oPlan.poResampler->SetNodataFillAction(utils::eNFA_BGD);
+    }
 
     // The background of an alpha band is 0 whatever that of the others.
     const std::vector<SourceBand>& oBands = oSource.GetBands();
@@ -131,9 +162,11 @@ RunPlan MakePlan(const ResampleOptions& oOptions, SourceRaster& oSource) {
 // Resamples block after block.
 class BlockRun {
  public:
-    BlockRun(const RunPlan& oPlan, SourceRaster& oSource)
+    // oUnmoved maps target pixels to where they are, whatever the method's window.
+    BlockRun(const RunPlan& oPlan, SourceRaster& oSource, const utils::BufPosScaleOffTfm& oUnmoved)
         : moPlan(oPlan),
           moSource(oSource),
+          moUnmoved(oUnmoved),
           moSrc(GetSourceTypes(oSource), oPlan.bJoined),
           moTgt(std::vector(oSource.GetBands().size(), oPlan.oTarget.eType), oPlan.bJoined) {
         moAlphaInfo = oPlan.poResampler->GetResampleInfo();
@@ -146,7 +179,7 @@ class BlockRun {
 
     long long GetSrcPixelBytes() const { return moSrc.GetPixelBytes() + moSource.GetMaskBytes(); }
     long long GetTgtPixelBytes() const {
-        return moTgt.GetPixelBytes() + (NeedsOutcome() ? 1 : 0) +
+        return moTgt.GetPixelBytes() + (NeedsOutcome() ? 1 : 0) + (moPlan.bFillApart ? 1 : 0) +
                (moPlan.oTarget.bMaskBand ? 1 : 0);
     }
 
@@ -165,7 +198,7 @@ class BlockRun {
         const utils::BufPosBlockTfm oTfm = oPlanner.GetLocalTfm(oBlock);
         for (int nGroup = 0; nGroup < moTgt.GetNumGroups(); ++nGroup) {
             ThrowIfInterrupted();
-            RunGroup(nGroup, oTfm, oBlock.oTarget.GetNumPix());
+            RunGroup(nGroup, oTfm, oBlock);
         }
         oTarget.Write(oBlock.oTarget, moTgt, moMask.Get());
     }
@@ -179,9 +212,34 @@ class BlockRun {
         return oTypes;
     }
 
-    bool NeedsOutcome() const { return moPlan.oTarget.bMaskBand || moPlan.bExactNodata; }
+    bool NeedsOutcome() const {
+        return moPlan.oTarget.bMaskBand || moPlan.bExactNodata || moPlan.bFillApart;
+    }
 
-    void RunGroup(int nGroup, const utils::BufPosBlockTfm& oTfm, long long nNumPix) {
+    // Fills the pixels that became background from their nearest pixels. Returns what became of
+    // each pixel; of those that are already computed, that they were left alone.
+    const unsigned char* FillApart(const utils::ResampleBuffer& oSrc, int nGroup,
+                                   utils::ResampleInfo oInfo, const utils::ResampleBlock& oBlock) {
+        const auto nNumPix = static_cast<std::size_t>(oBlock.oTarget.GetNumPix());
+        oInfo.meMethod = oInfo.meMethod >= eRM_SQBILIN ? eRM_SQNEAR : eRM_NEAR;
+        unsigned char* pabyRequest = moOutcome.Get();
+        std::replace_if(
+            pabyRequest, pabyRequest + nNumPix,
+            [](unsigned char n) { return n != utils::ePO_BACKGROUND; }, utils::ePO_UNTOUCHED);
+        std::replace(pabyRequest, pabyRequest + nNumPix,
+                     static_cast<unsigned char>(utils::ePO_BACKGROUND),
+                     static_cast<unsigned char>(utils::ePO_NEAREST));
+        moFilled.Reserve(nNumPix);
+        utils::ResampleBuffer oTgt = moTgt.GetGroup(nGroup, pabyRequest);
+        const utils::BufPosBlockTfm oTfm(moUnmoved, oBlock.oTarget, oBlock.oSource.nCol,
+                                         oBlock.oSource.nRow);
+        utils::Resample(oSrc, oTgt, oTfm, oInfo, moFilled.Get());
+        return moFilled.Get();
+    }
+
+    void RunGroup(int nGroup, const utils::BufPosBlockTfm& oTfm,
+                  const utils::ResampleBlock& oBlock) {
+        const long long nNumPix = oBlock.oTarget.GetNumPix();
         const bool bAlpha = moSource.GetBands()[static_cast<std::size_t>(nGroup)].bAlpha;
         const utils::ResampleInfo& oInfo = bAlpha ? moAlphaInfo : moInfo;
         const utils::ResampleBuffer oSrc = moSrc.GetGroup(nGroup, moSource.GetMask(nGroup, moSrc));
@@ -191,7 +249,8 @@ class BlockRun {
             return;
         }
         utils::Resample(oSrc, oTgt, oTfm, oInfo, moOutcome.Get());
-        const unsigned char* pabyOutcome = moOutcome.Get();
+        const unsigned char* pabyOutcome =
+            moPlan.bFillApart ? FillApart(oSrc, nGroup, oInfo, oBlock) : moOutcome.Get();
         if (moPlan.bExactNodata && !bAlpha) {
             moPlan.oTarget.oNodata->StoreBackground(oTgt.GetDatatype(), pabyOutcome, nNumPix,
                                                     oTgt.GetNumChan(), oTgt.GetBuf());
@@ -207,11 +266,13 @@ class BlockRun {
 
     const RunPlan& moPlan;
     SourceRaster& moSource;
+    const utils::BufPosScaleOffTfm& moUnmoved;
     BandArrays moSrc;
     BandArrays moTgt;
     utils::ResampleInfo moInfo;
     utils::ResampleInfo moAlphaInfo;
     ByteArray moOutcome;
+    ByteArray moFilled;
     ByteArray moMask;
 };
 
@@ -241,9 +302,12 @@ void RunResample(const ResampleOptions& oOptions) {
     oFormat.CheckHolds(oPlan.oTarget.eType);
     TargetFile oFile(ResolveTarget(oOptions.sTarget, oSource));
 
-    BlockRun oRun(oPlan, oSource);
-    const utils::BufPosScaleOffTfm oTfm(oGrid.nCols, oGrid.nRows, oGrid.dfColScale, 0.0,
-                                        oGrid.dfRowScale, 0.0, 0, 0);
+    const WindowShift oShift(*oPlan.poResampler);
+    const utils::BufPosScaleOffTfm oTfm(oGrid.nCols, oGrid.nRows, oGrid.dfColScale, oShift.dfCols,
+                                        oGrid.dfRowScale, oShift.dfRows, 0, 0);
+    const utils::BufPosScaleOffTfm oUnmoved(oGrid.nCols, oGrid.nRows, oGrid.dfColScale, 0.0,
+                                            oGrid.dfRowScale, 0.0, 0, 0);
+    BlockRun oRun(oPlan, oSource, oUnmoved);
     const long long nAllBytes =
         static_cast<long long>(oSource.GetNumCols()) * oSource.GetNumRows() *
             oRun.GetSrcPixelBytes() +

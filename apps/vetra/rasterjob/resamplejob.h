@@ -17,14 +17,14 @@ struct ResampleOptions {
     std::string sSource;
     std::string sTarget;
     GridRequest oGrid;
-    std::string sMethod = "BILIN";
+    std::string sMethod = "BILIN";                  ///< a resampler string
     std::optional<gobs::NativeDataTypeCode> oType;  ///< that of the source if absent
     std::optional<NodataValue> oNodata;             ///< replaces that of the source's bands
     std::optional<NodataValue> oTargetNodata;       ///< that of the source if absent
-    utils::NodataFillAction eFill = utils::eNFA_NN;
-    int nThreads = 0;           ///< 0 for all processors
-    long long nMemoryMb = 512;  ///< limit for the whole process
-    std::string sFormat;        ///< by the target's extension if empty
+    std::optional<utils::NodataFillAction> eFill;   ///< that of the method string if absent
+    int nThreads = 0;                               ///< 0 for all processors
+    long long nMemoryMb = 512;                      ///< limit for the whole process
+    std::string sFormat;                            ///< by the target's extension if empty
     std::vector<std::string> oCreationOptions;
     bool bQuiet = false;
 };

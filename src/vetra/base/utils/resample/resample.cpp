@@ -6,12 +6,19 @@
 
 #include <cstdint>
 
+#include "vetra/base/utils/resample/algorithm/resampleaverage.h"
 #include "vetra/base/utils/resample/algorithm/resamplebilinear.h"
+#include "vetra/base/utils/resample/algorithm/resamplecplxsar.h"
 #include "vetra/base/utils/resample/algorithm/resamplecubic.h"
 #include "vetra/base/utils/resample/algorithm/resamplecubicps.h"
+#include "vetra/base/utils/resample/algorithm/resamplekernel.h"
 #include "vetra/base/utils/resample/algorithm/resamplelagrange4.h"
 #include "vetra/base/utils/resample/algorithm/resamplelagrange8.h"
+#include "vetra/base/utils/resample/algorithm/resamplemedian.h"
 #include "vetra/base/utils/resample/algorithm/resamplenearest.h"
+#include "vetra/base/utils/resample/algorithm/resamplerinfo.h"
+#include "vetra/base/utils/resample/algorithm/resamplesinc16.h"
+#include "vetra/base/utils/resample/algorithm/resamplesinc8.h"
 #include "vetra/base/utils/resample/engine/dispatch.h"
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"
@@ -25,13 +32,7 @@ using vetra::ParameterException;
 using vetra::gobs::DataTypeAdapter;
 using vetra::gobs::NativeDataTypeCode;
 
-[[noreturn]] void RefuseMethod(ResampleMethod eMethod) {
-    if (eMethod >= eRM_BILIN && eMethod < eRM_CUSTOM) {
-        throw ParameterException("oResParms", ParameterException::eInvalid,
-                                 FormatString("method %d", static_cast<int>(eMethod)), "",
-                                 "This resample method is not available in this version",
-                                 VETRA_HERE);
-    }
+[[noreturn]] void RefuseMethod() {
     throw ParameterException("oResParms", ParameterException::eInvalid, "", "",
                              "The provided resample method was not recognized", VETRA_HERE);
 }
@@ -43,9 +44,6 @@ struct MethodCoefficients {
     int nSubPixels = 0;
     double dfFc = 0.0;
 };
-
-// Sub-pixel phases of a Gaussian kernel.
-constexpr int kGaussianSubPixels = 64;
 
 // Reads and checks what a method needs beside its samples.
 MethodCoefficients ReadCoefficients(const ResampleInfo& oResParms, int nNumChan) {
@@ -78,7 +76,7 @@ MethodCoefficients ReadCoefficients(const ResampleInfo& oResParms, int nNumChan)
             return oCoefficients;
         case eRM_GAUSSIAN:
         case eRM_SQGAUSSIAN:
-            oCoefficients.nSubPixels = kGaussianSubPixels;
+            oCoefficients.nSubPixels = kTabulatedSubPixels;
             break;
         case eRM_KERNEL:
         case eRM_SQKERNEL:
@@ -90,11 +88,7 @@ MethodCoefficients ReadCoefficients(const ResampleInfo& oResParms, int nNumChan)
     // The two factors stay below 2^32 and 2^31 + 1.
     const long long nTaps = static_cast<long long>(oCoefficients.nWndCols) + oCoefficients.nWndRows;
     const long long nPhases = static_cast<long long>(oCoefficients.nSubPixels) + 1;
-    if (static_cast<long long>(oResParms.mvdfKernelWeights.size()) < nTaps * nPhases) {
-        throw ParameterException("oResParms.mvdfKernelWeights", ParameterException::eInvalid, "",
-                                 "", "The number of kernel weights is wrong for this resampler.",
-                                 VETRA_HERE);
-    }
+    CheckNumWeights(oResParms.mvdfKernelWeights, nTaps * nPhases, VETRA_HERE);
     return oCoefficients;
 }
 
@@ -117,7 +111,8 @@ void ResampleFunc(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPo
                                                      oResParms.mbClampBgd,
                                                      oOptions};
     const NodataFillAction eFillAction = oResParms.meNodataFillAction;
-    ReadCoefficients(oResParms, oSrc.GetNumChan());
+    const MethodCoefficients oRead = ReadCoefficients(oResParms, oSrc.GetNumChan());
+    const std::vector<double>& vdfWeights = oResParms.mvdfKernelWeights;
     switch (oResParms.meMethod) {
         case eRM_NEAR:
             ResampleNearest(oArgs);
@@ -155,9 +150,47 @@ void ResampleFunc(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPo
         case eRM_SQLAGRANGE8:
             ResampleSqLagrange8(oArgs, eFillAction);
             return;
-        default:
-            RefuseMethod(oResParms.meMethod);
+        case eRM_SINC8:
+            ResampleSinc8(oArgs, eFillAction, vdfWeights);
+            return;
+        case eRM_SQSINC8:
+            ResampleSqSinc8(oArgs, eFillAction, vdfWeights);
+            return;
+        case eRM_SINC16:
+            ResampleSinc16(oArgs, eFillAction, vdfWeights);
+            return;
+        case eRM_SQSINC16:
+            ResampleSqSinc16(oArgs, eFillAction, vdfWeights);
+            return;
+        case eRM_GAUSSIAN:
+        case eRM_KERNEL:
+            ResampleKernel(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows, oRead.nSubPixels,
+                           vdfWeights);
+            return;
+        case eRM_SQGAUSSIAN:
+        case eRM_SQKERNEL:
+            ResampleSqKernel(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows, oRead.nSubPixels,
+                             vdfWeights);
+            return;
+        case eRM_AVERAGE:
+            ResampleAverage(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows);
+            return;
+        case eRM_SQAVERAGE:
+            ResampleSqAverage(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows);
+            return;
+        case eRM_MEDIAN:
+            ResampleMedian(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows);
+            return;
+        case eRM_SQMEDIAN:
+            ResampleSqMedian(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows);
+            return;
+        case eRM_CPLXSAR:
+            ResampleCplxSar(oArgs, eFillAction, oRead.nWndCols, oRead.nWndRows, oRead.dfFc);
+            return;
+        case eRM_CUSTOM:
+            break;
     }
+    RefuseMethod();
 }
 
 // A complex image as a real one with twice the channels, on the same memory. Buffers hand out their

@@ -101,12 +101,71 @@ struct SourceMask {
     }
 };
 
-// What a method does with a window of nSize x nSize pixels, nBefore of them before the position's.
+bool IsSquared(ResampleMethod eMethod) { return eMethod >= eRM_SQBILIN && eMethod != eRM_CUSTOM; }
+
+ResampleMethod PlainTwin(ResampleMethod eMethod) {
+    const ResampleMethod aePlain[] = {eRM_BILIN,     eRM_CUBIC,     eRM_CUBICPS,  eRM_NEAR,
+                                      eRM_SINC8,     eRM_SINC16,    eRM_AVERAGE,  eRM_MEDIAN,
+                                      eRM_LAGRANGE4, eRM_LAGRANGE8, eRM_GAUSSIAN, eRM_KERNEL};
+    return IsSquared(eMethod) ? aePlain[eMethod - eRM_SQBILIN] : eMethod;
+}
+
+// What a run's method needs, with its squared twin apart.
 struct PlainMethod {
-    int nSize;
-    int nBefore;
-    double (*fnAlong)(const double* p, double t);  // null: bilinear
+    explicit PlainMethod(const ResampleInfo& oInfo)
+        : eMethod(PlainTwin(oInfo.meMethod)),
+          bSquared(IsSquared(oInfo.meMethod)),
+          pdfWeights(oInfo.mvdfKernelWeights.data()) {
+        switch (eMethod) {
+            case eRM_NEAR:
+                nCols = nRows = 1;
+                bAnchorNearest = true;
+                break;
+            case eRM_BILIN:
+                nCols = nRows = 2;
+                break;
+            case eRM_LAGRANGE8:
+            case eRM_SINC8:
+                nCols = nRows = 8;
+                break;
+            case eRM_SINC16:
+                nCols = nRows = 16;
+                break;
+            case eRM_AVERAGE:
+            case eRM_MEDIAN:
+            case eRM_GAUSSIAN:
+            case eRM_KERNEL:
+            case eRM_CPLXSAR:
+                oInfo.GetCoefficientInt("NUMCOLS", nCols, true);
+                oInfo.GetCoefficientInt("NUMROWS", nRows, true);
+                oInfo.GetCoefficientInt("NUMSUBPIXELS", nSubPixels, false);
+                oInfo.GetCoefficientDouble("FC", dfFc, false);
+                bAnchorNearest = eMethod != eRM_GAUSSIAN && eMethod != eRM_KERNEL;
+                break;
+            default:
+                nCols = nRows = 4;
+                break;
+        }
+        nBeforeCol = (nCols - 1) / 2;
+        nBeforeRow = (nRows - 1) / 2;
+        if (eMethod == eRM_AVERAGE || eMethod == eRM_MEDIAN) nBeforeCol = nBeforeRow = 0;
+    }
+
+    double Anchor(double dfPos) const { return std::floor(bAnchorNearest ? dfPos + 0.5 : dfPos); }
+
+    ResampleMethod eMethod;
+    bool bSquared;
+    const double* pdfWeights;
+    int nCols = 0;
+    int nRows = 0;
+    int nBeforeCol = 0;  // pixels of the window before the anchor
+    int nBeforeRow = 0;
+    bool bAnchorNearest = false;
+    int nSubPixels = 64;
+    double dfFc = 0;
 };
+
+using Samples = std::vector<double>;  // of a window, row by row
 
 double Cubic(const double* p, double t) {
     double a = p[0] + p[0];
@@ -149,38 +208,25 @@ double Lagrange8(const double* p, double t) {
     return term[1] - term[0] - term[2] + term[3] - term[4] + term[5] - term[6] + term[7];
 }
 
-bool IsSquared(ResampleMethod eMethod) { return eMethod >= eRM_SQBILIN && eMethod != eRM_CUSTOM; }
-bool IsOneOf(ResampleMethod eMethod, ResampleMethod ePlain, ResampleMethod eSquared) {
-    return eMethod == ePlain || eMethod == eSquared;
-}
-
-PlainMethod GetMethod(ResampleMethod eMethod) {
-    if (IsOneOf(eMethod, eRM_BILIN, eRM_SQBILIN)) return {2, 0, nullptr};
-    if (IsOneOf(eMethod, eRM_LAGRANGE4, eRM_SQLAGRANGE4)) return {4, 1, &Lagrange4};
-    if (IsOneOf(eMethod, eRM_LAGRANGE8, eRM_SQLAGRANGE8)) return {8, 3, &Lagrange8};
-    return {4, 1, &Cubic};
-}
-
 int ChooseMode(int nRequest, const SourceMask& oMask, double dfCol, double dfRow,
-               const ResampleInfo& oInfo) {
-    const bool bReplaces = IsOneOf(oInfo.meMethod, eRM_CUBICPS, eRM_SQCUBICPS);
+               const PlainMethod& oMethod, NodataFillAction eFillAction) {
+    const bool bReplaces = oMethod.eMethod == eRM_CUBICPS;
     if (!bReplaces && (nRequest == 0 || nRequest == 3)) return nRequest;
     const double dfNearCol = std::floor(dfCol + 0.5);
     const double dfNearRow = std::floor(dfRow + 0.5);
     const bool bInside = oMask.Inside(dfNearCol, dfNearRow);
-    if (IsOneOf(oInfo.meMethod, eRM_NEAR, eRM_SQNEAR)) {
+    if (oMethod.eMethod == eRM_NEAR) {
         if (!bInside || oMask.Byte(dfNearCol, dfNearRow) == 0) return 0;
         return nRequest <= 2 ? 2 : 3;
     }
     const int nUsable = bInside && oMask.Byte(dfNearCol, dfNearRow) == 1 ? 2 : 0;
     if (!bReplaces && nRequest == 2) return nUsable;
-    const PlainMethod oMethod = GetMethod(oInfo.meMethod);
     bool bWhole = true;
-    for (int y = 0; y < oMethod.nSize; ++y) {
-        for (int x = 0; x < oMethod.nSize; ++x) {
-            const double dfX = std::floor(dfCol) - oMethod.nBefore + x;
-            const double dfY = std::floor(dfRow) - oMethod.nBefore + y;
-            bWhole = bWhole && oMask.Inside(dfX, dfY) && (bReplaces || oMask.Byte(dfX, dfY) != 0);
+    for (int y = 0; y < oMethod.nRows && bWhole; ++y) {
+        for (int x = 0; x < oMethod.nCols && bWhole; ++x) {
+            const double dfX = oMethod.Anchor(dfCol) - oMethod.nBeforeCol + x;
+            const double dfY = oMethod.Anchor(dfRow) - oMethod.nBeforeRow + y;
+            bWhole = oMask.Inside(dfX, dfY) && (bReplaces || oMask.Byte(dfX, dfY) != 0);
         }
     }
     if (bReplaces) {
@@ -188,51 +234,186 @@ int ChooseMode(int nRequest, const SourceMask& oMask, double dfCol, double dfRow
         return nRequest <= 2 ? nRequest : 3;
     }
     if (bWhole) return 1;
-    return oInfo.meNodataFillAction == eNFA_BGD ? 0 : nUsable;
+    return eFillAction == eNFA_BGD ? 0 : nUsable;
 }
 
-double Bilinear(const double (&p)[8][8], double dx, double dy) {
+double Bilinear(const Samples& p, double dx, double dy) {
     const double w00 = (1 - dx) * (1 - dy);
     const double w10 = (1 - dy) * dx;
     const double w01 = (1 - dx) * dy;
     const double w11 = dy * dx;
-    double v = p[0][1] * w10;
-    v = v + p[0][0] * w00;
-    v = v + p[1][0] * w01;
-    return v + p[1][1] * w11;
+    double v = p[1] * w10;
+    v = v + p[0] * w00;
+    v = v + p[2] * w01;
+    return v + p[3] * w11;
 }
 
-// The value in mode 1. fnSample gives the channel's sample at a source pixel.
-template <typename Function>
-double Interpolate(const ResampleInfo& oInfo, const SourceMask& oMask, double dfCol, double dfRow,
-                   const Function& fnSample) {
-    const PlainMethod oMethod = GetMethod(oInfo.meMethod);
-    const bool bReplaces = IsOneOf(oInfo.meMethod, eRM_CUBICPS, eRM_SQCUBICPS);
-    const bool bSquared = IsSquared(oInfo.meMethod);
-    double p[8][8];
-    for (int y = 0; y < oMethod.nSize; ++y) {
-        for (int x = 0; x < oMethod.nSize; ++x) {
-            double dfX = std::floor(dfCol) - oMethod.nBefore + x;
-            double dfY = std::floor(dfRow) - oMethod.nBefore + y;
-            if (bReplaces && oMask.Byte(dfX, dfY) == 0) {
-                dfX = std::floor(dfCol + 0.5);
-                dfY = std::floor(dfRow + 0.5);
+// First along each row, then along the row values.
+double AlongBoth(const Samples& p, int nSize, double (*fnAlong)(const double*, double), double dx,
+                 double dy) {
+    double rows[8];
+    for (int y = 0; y < nSize; ++y) rows[y] = fnAlong(&p[static_cast<std::size_t>(y * nSize)], dx);
+    return fnAlong(rows, dy);
+}
+
+int Phase(double dfFrac, int nSubPixels, int nLast) {
+    const double dfPhase = std::floor(dfFrac * nSubPixels + 0.5);
+    return dfPhase < 0 ? 0 : dfPhase > nLast ? nLast : static_cast<int>(dfPhase);
+}
+
+double Convolve(const PlainMethod& oMethod, const Samples& p, const double* pdfAcross,
+                const double* pdfDown) {
+    std::size_t i = 0;
+    double sum = 0.0;
+    for (int y = 0; y < oMethod.nRows; ++y) {
+        double row = 0.0;
+        for (int x = 0; x < oMethod.nCols; ++x) row += p[i++] * pdfAcross[x];
+        sum += row * pdfDown[y];
+    }
+    return sum;
+}
+
+double Kernel(const PlainMethod& oMethod, const Samples& p, double dx, double dy) {
+    const int S = oMethod.nSubPixels;
+    const double* pdfDown = oMethod.pdfWeights;
+    if (oMethod.eMethod == eRM_GAUSSIAN || oMethod.eMethod == eRM_KERNEL) {
+        pdfDown += (S + 1) * oMethod.nCols;
+    }
+    return Convolve(oMethod, p, oMethod.pdfWeights + Phase(dx, S, S) * oMethod.nCols,
+                    pdfDown + Phase(dy, S, S) * oMethod.nRows);
+}
+
+double Mean(const Samples& p) {
+    double sum = 0.0;
+    for (const double s : p) sum += s;
+    return sum / static_cast<double>(p.size());
+}
+
+// Hoare's selection; a copy, since it reorders.
+double Median(Samples a) {
+    const int n = static_cast<int>(a.size());
+    const int k = n % 2 == 1 ? n / 2 : n / 2 - 1;
+    const auto at = [&](int i) -> double& { return a[static_cast<std::size_t>(i)]; };
+    int left = 0;
+    int right = n - 1;
+    while (left < right) {
+        const double p = at(k);
+        int i = left;
+        int j = right;
+        do {
+            while (p > at(i)) i++;
+            while (at(j) > p) j--;
+            if (i <= j) {
+                std::swap(at(i), at(j));
+                i++;
+                j--;
             }
-            const double s = fnSample(static_cast<long long>(dfX), static_cast<long long>(dfY));
-            p[y][x] = !bSquared ? s : s > 0.0 ? std::sqrt(s) : 0.0;
+        } while (i <= j);
+        if (j < k) left = i;
+        if (k < i) right = j;
+    }
+    return at(k);
+}
+
+// Taps of the radar filter in one phase: the raised cosine times sinc, not yet normalised.
+Samples RadarTaps(int n, int nPhase, double* pdfSum, Samples* pvdfAngle, double dfFc) {
+    const double pi = 3.141592653589793;
+    const double f = nPhase * (1.0 / 64) - 0.5;
+    const int half = (n - 1) / 2;
+    Samples g;
+    *pdfSum = 0.0;
+    double t = -f - half;
+    for (int j = 0; j < n; ++j) {
+        const double u = pi * t;
+        const double s = u == 0.0 ? 1.0 : std::sin(u) / u;
+        g.push_back((0.5 * std::cos(u / (half + 1)) + 0.5) * s);
+        *pdfSum += g.back();
+        pvdfAngle->push_back((half + t) * (dfFc * -2 * pi));
+        t += 1.0;
+    }
+    return g;
+}
+
+// The real part, or the imaginary one.
+double Radar(const PlainMethod& oMethod, const Samples& re, const Samples& im, double dx, double dy,
+             bool bImaginary) {
+    double dfSumX;
+    double dfSumY;
+    Samples angle;
+    const Samples across =
+        RadarTaps(oMethod.nCols, Phase(dx + 0.5, 64, 63), &dfSumX, &angle, oMethod.dfFc);
+    angle.clear();
+    const Samples down =
+        RadarTaps(oMethod.nRows, Phase(dy + 0.5, 64, 63), &dfSumY, &angle, oMethod.dfFc);
+    double out = 0.0;
+    std::size_t i = 0;
+    for (std::size_t y = 0; y < down.size(); ++y) {
+        double rowRe = 0.0;
+        double rowIm = 0.0;
+        for (std::size_t x = 0; x < across.size(); ++x, ++i) {
+            rowRe += re[i] * (across[x] / dfSumX);
+            rowIm += im[i] * (across[x] / dfSumX);
         }
+        const double c = down[y] * std::cos(angle[y]) / dfSumY;
+        const double d = down[y] * std::sin(angle[y]) / dfSumY;
+        out += bImaginary ? d * rowRe + c * rowIm : c * rowRe - d * rowIm;
     }
-    const double dx = dfCol - std::floor(dfCol);
-    const double dy = dfRow - std::floor(dfRow);
+    return out;
+}
+
+double PlainValue(const PlainMethod& oMethod, const Samples& p, double dx, double dy) {
+    switch (oMethod.eMethod) {
+        case eRM_BILIN:
+            return Bilinear(p, dx, dy);
+        case eRM_CUBIC:
+        case eRM_CUBICPS:
+            return AlongBoth(p, 4, &Cubic, dx, dy);
+        case eRM_LAGRANGE4:
+            return AlongBoth(p, 4, &Lagrange4, dx, dy);
+        case eRM_LAGRANGE8:
+            return AlongBoth(p, 8, &Lagrange8, dx, dy);
+        case eRM_AVERAGE:
+            return Mean(p);
+        case eRM_MEDIAN:
+            return Median(p);
+        default:
+            return Kernel(oMethod, p, dx, dy);
+    }
+}
+
+// The value of channel nChannel in mode 1. fnSample gives a channel's sample at a source pixel.
+template <typename Function>
+double Interpolate(const PlainMethod& oMethod, const SourceMask& oMask, double dfCol, double dfRow,
+                   int nChannel, const Function& fnSample) {
+    const double dfX0 = oMethod.Anchor(dfCol) - oMethod.nBeforeCol;
+    const double dfY0 = oMethod.Anchor(dfRow) - oMethod.nBeforeRow;
+    const auto fnWindow = [&](int c) {
+        Samples p;
+        for (int y = 0; y < oMethod.nRows; ++y) {
+            for (int x = 0; x < oMethod.nCols; ++x) {
+                double dfX = dfX0 + x;
+                double dfY = dfY0 + y;
+                if (oMethod.eMethod == eRM_CUBICPS && oMask.Byte(dfX, dfY) == 0) {
+                    dfX = std::floor(dfCol + 0.5);
+                    dfY = std::floor(dfRow + 0.5);
+                }
+                const double s =
+                    fnSample(static_cast<long long>(dfX), static_cast<long long>(dfY), c);
+                p.push_back(!oMethod.bSquared ? s : s > 0.0 ? std::sqrt(s) : 0.0);
+            }
+        }
+        return p;
+    };
+    const double dx = dfCol - oMethod.Anchor(dfCol);
+    const double dy = dfRow - oMethod.Anchor(dfRow);
     double v;
-    if (oMethod.fnAlong == nullptr) {
-        v = Bilinear(p, dx, dy);
+    if (oMethod.eMethod == eRM_CPLXSAR) {
+        const int nReal = nChannel / 2 * 2;
+        v = Radar(oMethod, fnWindow(nReal), fnWindow(nReal + 1), dx, dy, nChannel % 2 == 1);
     } else {
-        double rows[8];
-        for (int y = 0; y < oMethod.nSize; ++y) rows[y] = oMethod.fnAlong(p[y], dx);
-        v = oMethod.fnAlong(rows, dy);
+        v = PlainValue(oMethod, fnWindow(nChannel), dx, dy);
     }
-    v = bSquared ? v * v : v;
+    v = oMethod.bSquared ? v * v : v;
     return std::isnan(v) ? std::numeric_limits<double>::quiet_NaN() : v;
 }
 
@@ -240,10 +421,17 @@ template <typename Tin, typename Tout>
 void Run(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPosTfm& oTfm,
          const ResampleInfo& oInfo, std::vector<unsigned char>& vbyOutcome) {
     const Storer<Tout> oStorer(oInfo);
+    const PlainMethod oMethod(oInfo);
     const int nChan = oSrc.GetNumChan();
     const long long nPitch = static_cast<long long>(oSrc.GetNumCols()) * nChan;
     const Tin* pSrc = reinterpret_cast<const Tin*>(oSrc.GetBuf());
     const SourceMask oMask{oSrc.GetMask(), oSrc.GetNumCols(), oSrc.GetNumRows()};
+    const auto fnSample = [&](long long x, long long y, int c) {
+        return static_cast<double>(pSrc[y * nPitch + x * nChan + c]);
+    };
+    // These two take negative nearest samples as they are.
+    const bool bNonNegative =
+        oMethod.bSquared && oMethod.eMethod != eRM_GAUSSIAN && oMethod.eMethod != eRM_KERNEL;
     const long long nPix = static_cast<long long>(oTgt.GetNumCols()) * oTgt.GetNumRows();
     vbyOutcome.assign(static_cast<std::size_t>(nPix), 0);
     for (long long i = 0; i < nPix; ++i) {
@@ -251,21 +439,19 @@ void Run(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPosTfm& oTf
         double dfRow = 0;
         oTfm.GetSrcPos(i, dfCol, dfRow);
         const int nRequest = oTgt.GetMask() == nullptr ? 1 : oTgt.GetMask()[i];
-        const int nMode = ChooseMode(nRequest, oMask, dfCol, dfRow, oInfo);
+        const int nMode =
+            ChooseMode(nRequest, oMask, dfCol, dfRow, oMethod, oInfo.meNodataFillAction);
         vbyOutcome[static_cast<std::size_t>(i)] = static_cast<unsigned char>(nMode);
         for (int c = 0; c < nChan; ++c) {
-            const auto fnSample = [&](long long x, long long y) {
-                return static_cast<double>(pSrc[y * nPitch + x * nChan + c]);
-            };
             Tout* pTgt = reinterpret_cast<Tout*>(oTgt.GetBuf()) + i * nChan + c;
             if (nMode == 0) {
                 *pTgt = oStorer.Background();
             } else if (nMode == 1) {
-                *pTgt = oStorer.Store(Interpolate(oInfo, oMask, dfCol, dfRow, fnSample));
+                *pTgt = oStorer.Store(Interpolate(oMethod, oMask, dfCol, dfRow, c, fnSample));
             } else if (nMode == 2) {
                 const double s = fnSample(static_cast<long long>(std::floor(dfCol + 0.5)),
-                                          static_cast<long long>(std::floor(dfRow + 0.5)));
-                *pTgt = oStorer.Store(IsSquared(oInfo.meMethod) && 0.0 > s ? 0.0 : s);
+                                          static_cast<long long>(std::floor(dfRow + 0.5)), c);
+                *pTgt = oStorer.Store(bNonNegative && 0.0 > s ? 0.0 : s);
             }
         }
     }

@@ -18,7 +18,7 @@ MedianResampler* MedianResampler::Clone() const { return new MedianResampler(*th
 
 SqMedianResampler::SqMedianResampler() = default;
 SqMedianResampler::SqMedianResampler(int nWndNumCols, int nWndNumRows) {
-    CheckWindowSize(nWndNumCols, nWndNumRows, "median", 11, VETRA_HERE);
+    CheckWindowSize(nWndNumCols, nWndNumRows, "median", kSqMedianLimit, VETRA_HERE);
     SetResampleInfo(MethodInfo(eRM_SQMEDIAN, WindowCoefficients(nWndNumCols, nWndNumRows)));
     SetWindowExtents(0, 0, nWndNumCols, nWndNumRows, eWAP_NEAREST, eWAP_NEAREST);
 }

@@ -73,4 +73,27 @@ void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunc
     }
 }
 
+void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,
+                     const char* pszFunction, std::uint32_t nLine) {
+    CheckSizes(nWndNumCols, nWndNumRows,
+               {"kernel resampler", "Non-zero positive number", "non-zero positive number",
+                kNoLimit, false},
+               pszFile, pszFunction, nLine);
+    if (nSubPixels < 0) {
+        throw ParameterException("nSubPixels", ParameterException::eInvalid,
+                                 FormatString("%d", nSubPixels), "Positive number",
+                                 "Num of subpixels for kernel resampler must be a positive number",
+                                 pszFile, pszFunction, nLine);
+    }
+}
+
+void CheckNumWeights(const std::vector<double>& vdfWeights, long long nNeeded, const char* pszFile,
+                     const char* pszFunction, std::uint32_t nLine) {
+    if (static_cast<long long>(vdfWeights.size()) < nNeeded) {
+        throw ParameterException("oResParms.mvdfKernelWeights", ParameterException::eInvalid, "",
+                                 "", "The number of kernel weights is wrong for this resampler.",
+                                 pszFile, pszFunction, nLine);
+    }
+}
+
 }  // namespace vetra::utils

@@ -3,10 +3,11 @@
 
 #include <cstdint>
 #include <limits>
+#include <vector>
 
 #include "vetra/base/utils/resample/resampleinfo.h"
 
-// Private: what the constructors of the resampler classes share.
+// Private: what the constructors of the resampler classes and the sampling templates share.
 namespace vetra::utils {
 
 /// The parameters of a new resampler: the defaults, with a method and its coefficients.
@@ -15,7 +16,11 @@ ResampleInfo MethodInfo(ResampleMethod eMethod, const CoefficientMap& oCoefficie
 /// The coefficients "NUMCOLS" and "NUMROWS".
 CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows);
 
+/// Sub-pixel phases of the tables that this library makes: a fraction's phases are 0 to 64.
+constexpr int kTabulatedSubPixels = 64;
+
 constexpr int kNoLimit = std::numeric_limits<int>::max();
+constexpr int kSqMedianLimit = 11;
 
 /// Refuses a window size that is not from 1 to \p nMax, columns first, with `ParameterException`.
 /// \p pszWhat names the method in the message.
@@ -29,6 +34,15 @@ void CheckCplxSarSize(int nWndNumCols, int nWndNumRows, const char* pszFile,
 /// Refuses a central frequency outside -0.5 to 0.5, with `ParameterException`.
 void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunction,
                            std::uint32_t nLine);
+
+/// Refuses a window of less than one column or row, then a number of sub-pixels below 0, with
+/// `ParameterException`.
+void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,
+                     const char* pszFunction, std::uint32_t nLine);
+
+/// Refuses fewer weights than a method reads, with `ParameterException`.
+void CheckNumWeights(const std::vector<double>& vdfWeights, long long nNeeded, const char* pszFile,
+                     const char* pszFunction, std::uint32_t nLine);
 
 }  // namespace vetra::utils
 

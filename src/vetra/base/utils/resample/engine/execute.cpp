@@ -17,6 +17,8 @@
 #include <cstddef>
 #include <cstdint>
 #include <cstring>
+#include <memory>
+#include <vector>
 
 #include "vetra/base/utils/resample/engine/columntables.h"
 #include "vetra/base/utils/resample/engine/positions.h"
@@ -65,10 +67,12 @@ struct SpanArrays {
     alignas(64) unsigned char abyMode[kSpanArray] = {};
 };
 
-// Values of one channel of a span, and the samples they become.
+// Values of the channels of a span that are made at once, and the samples one becomes.
 struct ValueArrays {
-    alignas(64) double adfValue[kSpanArray] = {};
+    // As many as the values stage may fill at once.
+    alignas(64) double adfValue[2 * kSpanArray] = {};
     alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
+    double* padfScratch = nullptr;
 };
 
 unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
@@ -87,18 +91,22 @@ class Run {
  public:
     explicit Run(const Task& oTask);
 
+    // Doubles of working memory that a thread needs; none where no window fits into the source.
+    std::size_t GetScratchSize() const;
+
     // Fills target pixels nBegin to nEnd - 1.
-    void Walk(long long nBegin, long long nEnd) const {
-        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd) : WalkRows(nBegin, nEnd);
+    void Walk(long long nBegin, long long nEnd, double* padfScratch) const {
+        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd, padfScratch)
+                                  : WalkRows(nBegin, nEnd, padfScratch);
     }
 
  private:
-    void WalkGeneral(long long nBegin, long long nEnd) const;
+    void WalkGeneral(long long nBegin, long long nEnd, double* padfScratch) const;
     void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
     // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
     [[gnu::always_inline]] inline void Prefetch(const Span& oSpan) const;
 
-    void WalkRows(long long nBegin, long long nEnd) const;
+    void WalkRows(long long nBegin, long long nEnd, double* padfScratch) const;
     void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
                  ValueArrays& oValues) const;
 
@@ -107,6 +115,8 @@ class Run {
                      long long nNearestShift, unsigned char* pabyClassThenMode) const;
 
     void Finish(const Span& oSpan, ValueArrays& oValues) const;
+    void StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
+                      unsigned char* pabySample) const;
     void CopyRuns(const Span& oSpan) const;
     void FillBackground(long long nFirst, int nPix) const;
     template <typename Bits>
@@ -173,9 +183,21 @@ Run::Run(const Task& oTask)
     }
 }
 
-void Run::WalkGeneral(long long nBegin, long long nEnd) const {
+std::size_t Run::GetScratchSize() const {
+    const Window& oWindow = moMethod.oWindow;
+    if (moMethod.nScratch == 0 || oWindow.nCols > moTask.nSrcCols ||
+        oWindow.nRows > moTask.nSrcRows) {
+        return 0;
+    }
+    // No more than the pixels of the source, which are in memory.
+    return static_cast<std::size_t>(oWindow.nCols) * static_cast<std::size_t>(oWindow.nRows) *
+           static_cast<std::size_t>(kLanes * moMethod.nScratch);
+}
+
+void Run::WalkGeneral(long long nBegin, long long nEnd, double* padfScratch) const {
     SpanArrays oArrays;
     ValueArrays oValues;
+    oValues.padfScratch = padfScratch;
     for (long long nFirst = nBegin; nFirst < nEnd; nFirst += kSpanPixels) {
         Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)), oArrays);
         Finish(oArrays.oSpan, oValues);
@@ -270,8 +292,9 @@ void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
     }
 }
 
-void Run::WalkRows(long long nBegin, long long nEnd) const {
+void Run::WalkRows(long long nBegin, long long nEnd, double* padfScratch) const {
     ValueArrays oValues;
+    oValues.padfScratch = padfScratch;
     const int nCols = moTask.nTgtCols;
     for (long long nFirst = nBegin; nFirst < nEnd;) {
         const int nFirstCol = static_cast<int>(nFirst % nCols);
@@ -356,7 +379,6 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
         return;
     }
     const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
-    const bool bNearest = (oSpan.nModes & kSetNearest) != 0;
     WindowSpan oWindows;
     oWindows.panOffset = oSpan.panWindow;
     oWindows.padfFracCol = oSpan.padfFracCol;
@@ -367,35 +389,44 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.nChan = moTask.nChan;
     oWindows.pabyMask = oSpan.pabyWindowMask;
     oWindows.poGroups = oSpan.poGroups;
-    const auto& apfnNearest =
-        moMethod.bNonNegative ? moStages.apfnNonNegativeNearest : moStages.apfnNearest;
-    for (int nChannel = 0; nChannel < moTask.nChan; ++nChannel) {
-        const std::ptrdiff_t nShift = static_cast<std::ptrdiff_t>(nChannel) * mnSrcBytes;
+    oWindows.pParameters = moTask.pParameters;
+    oWindows.padfScratch = oValues.padfScratch;
+    for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
         if (bWindows) {
             moStages.apfnValues[moMethod.eValues][moTask.nSrcType](
-                oWindows, oSpan.pWindowSrc + nShift, moTask.pParameters, oValues.adfValue);
+                oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes,
+                oValues.adfValue);
         }
-        if (bNearest) {
-            apfnNearest[moTask.nSrcType](oSpan.pNearestSrc + nShift, oSpan.panNearest,
-                                         oSpan.ModesUnless(kSetNearest), oSpan.nPix,
-                                         oValues.adfValue);
+        for (int i = 0; i < moMethod.nChannels; ++i) {
+            StoreChannel(oSpan, nChannel + i, oValues.adfValue + i * kSpanArray, oValues.abySample);
         }
-        moStages.apfnStore[moTask.nTgtType](oValues.adfValue, oSpan.nPix, moTask.pLimits,
-                                            oValues.abySample);
-        switch (mnTgtBytes) {
-            case 1:
-                Deliver<std::uint8_t>(oSpan, nChannel, oValues.abySample);
-                break;
-            case 2:
-                Deliver<std::uint16_t>(oSpan, nChannel, oValues.abySample);
-                break;
-            case 4:
-                Deliver<std::uint32_t>(oSpan, nChannel, oValues.abySample);
-                break;
-            default:
-                Deliver<std::uint64_t>(oSpan, nChannel, oValues.abySample);
-                break;
-        }
+    }
+}
+
+// Adds the nearest samples to the values of a channel, and writes them.
+void Run::StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
+                       unsigned char* pabySample) const {
+    if ((oSpan.nModes & kSetNearest) != 0) {
+        const auto& apfnNearest =
+            moMethod.bNonNegative ? moStages.apfnNonNegativeNearest : moStages.apfnNearest;
+        apfnNearest[moTask.nSrcType](oSpan.pNearestSrc + std::ptrdiff_t{nChannel} * mnSrcBytes,
+                                     oSpan.panNearest, oSpan.ModesUnless(kSetNearest), oSpan.nPix,
+                                     padfValue);
+    }
+    moStages.apfnStore[moTask.nTgtType](padfValue, oSpan.nPix, moTask.pLimits, pabySample);
+    switch (mnTgtBytes) {
+        case 1:
+            Deliver<std::uint8_t>(oSpan, nChannel, pabySample);
+            break;
+        case 2:
+            Deliver<std::uint16_t>(oSpan, nChannel, pabySample);
+            break;
+        case 4:
+            Deliver<std::uint32_t>(oSpan, nChannel, pabySample);
+            break;
+        default:
+            Deliver<std::uint64_t>(oSpan, nChannel, pabySample);
+            break;
     }
 }
 
@@ -475,16 +506,24 @@ void Run::FillBackground(long long nFirst, int nPix) const {
 void Execute(const Task& oTask) {
     const Run oRun(oTask);
     const long long nNumPix = static_cast<long long>(oTask.nTgtCols) * oTask.nTgtRows;
-#pragma omp parallel
+    const int nMaxThreads = omp_get_max_threads();
+    const std::size_t nScratch = oRun.GetScratchSize();
+    std::vector<std::unique_ptr<double[]>> vpadfScratch(static_cast<std::size_t>(nMaxThreads));
+    if (nScratch > 0) {
+        for (auto& padfScratch : vpadfScratch) {
+            padfScratch.reset(new double[nScratch]);
+        }
+    }
+#pragma omp parallel num_threads(nMaxThreads)
     {
+        const int nThread = omp_get_thread_num();
         const long long nThreads = omp_get_num_threads();
-        const long long nThread = omp_get_thread_num();
         const long long nShare = nNumPix / nThreads;
         const long long nRest = nNumPix % nThreads;
-        const long long nBegin = nThread * nShare + std::min(nThread, nRest);
+        const long long nBegin = nThread * nShare + std::min<long long>(nThread, nRest);
         const long long nEnd = nBegin + nShare + (nThread < nRest ? 1 : 0);
         if (nBegin < nEnd) {
-            oRun.Walk(nBegin, nEnd);
+            oRun.Walk(nBegin, nEnd, vpadfScratch[static_cast<std::size_t>(nThread)].get());
         }
     }
 }

@@ -85,6 +85,36 @@ struct WindowSpan {
     /// Of each eight pixels, for 8-bit samples and windows of two columns in an axis-aligned run of
     /// one channel; else null.
     const PairGroup* poGroups;
+    /// What the method prepared for the run; may be null.
+    const void* pParameters;
+    /// The thread's own working memory, as much as the method asked for; null if it didn't.
+    double* padfScratch;
+};
+
+/// What the statistics of a window know of a run.
+struct WindowSize {
+    int nCols;
+    int nRows;
+};
+
+/// Weights of a separable window, for nPhases positions between two pixels: phase by phase, within
+/// a phase tap by tap.
+struct KernelTables {
+    const double* padfAcross;  ///< of the columns, [phases x columns]
+    const double* padfDown;    ///< of the rows, [phases x rows]
+    int nCols;
+    int nRows;
+    int nSubPixels;  ///< phases in a pixel; there is one phase more
+};
+
+/// The same where the rows have complex weights and phases begin half a pixel before the anchor.
+struct ComplexKernelTables {
+    const double* padfAcross;
+    const double* padfDownReal;
+    const double* padfDownImag;
+    int nCols;
+    int nRows;
+    int nPhases;
 };
 
 /// What a store stage knows of the output type's clamp.
@@ -98,10 +128,10 @@ struct StoreLimits {
     T replacement;  ///< what a value too near becomes
 };
 
-/// Computes kSpanPixels-wide arrays of values from samples of one channel. pSrc points at the
-/// channel's first sample, pParameters at what the method prepared for the run.
-using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, const void* pParameters,
-                                double* padfValue);
+/// Computes an array of kSpanPixels values from the samples of one channel, or, for a method that
+/// takes two channels at once, two arrays kSpanArray apart. pSrc points at the (first) channel's
+/// first sample.
+using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, double* padfValue);
 /// Reads the samples at panOffset of the pixels whose mode is 2.
 using NearestFunction = void (*)(const void* pSrc, const std::int64_t* panOffset,
                                  const unsigned char* pabyMode, int nPix, double* padfValue);
@@ -114,19 +144,19 @@ using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, i
 /// Clamps samples of an integer type in place.
 using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void* pLimits);
 
-/// The ways of making a value out of a window, each a row of a level's table. The squared ones work
-/// on the roots of the samples.
+/// The ways of making a value out of a window: name of the row in a level's table, and the type
+/// that holds the mathematics. Each row has a twin that works on the roots of the samples.
+#define VETRA_VALUES_ROWS(Row)                                                            \
+    Row(BILINEAR, Bilinear) Row(CUBIC, Cubic) Row(CUBICPS, CubicPs)                       \
+        Row(LAGRANGE4, Lagrange<LagrangeBasis4>) Row(LAGRANGE8, Lagrange<LagrangeBasis8>) \
+            Row(SINC8, Kernel<8>) Row(SINC16, Kernel<16>) Row(KERNEL, Kernel<kAnySize>)   \
+                Row(AVERAGE, Average) Row(MEDIAN, Median)
+
 enum ValuesRow : int {
-    eVR_BILINEAR,
-    eVR_CUBIC,
-    eVR_CUBICPS,
-    eVR_LAGRANGE4,
-    eVR_LAGRANGE8,
-    eVR_SQBILINEAR,
-    eVR_SQCUBIC,
-    eVR_SQCUBICPS,
-    eVR_SQLAGRANGE4,
-    eVR_SQLAGRANGE8,
+#define VETRA_ROW(Name, Type) eVR_##Name, eVR_SQ##Name,
+    VETRA_VALUES_ROWS(VETRA_ROW)
+#undef VETRA_ROW
+        eVR_CPLXSAR,
     kNumValues,
     eVR_NONE = -1,  ///< for a method without a window
 };

@@ -260,6 +260,9 @@ void NearestPlaces(double dfPitch, double dfChan, const double* padfCol, const d
 template <typename T>
 inline constexpr bool kIsFloating = T(0.5) != T(0);
 
+// The size of a method's windows where each run has its own.
+constexpr int kAnySize = 0;
+
 // The windows of eight pixels, for one channel.
 template <typename T, bool kSingleChannel>
 struct WindowReader {
@@ -280,6 +283,24 @@ struct WindowReader {
             }
         }
     }
+
+    // The sample in column nCol of window row nRow.
+    F64 Sample(int nRow, int nCol) const {
+        return Gather(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
+                      panOffset);
+    }
+
+    // That sample and the one of the next channel.
+    void ChannelPair(int nRow, int nCol, F64& first, F64& second) const {
+        GatherPair(pFirst + nRow * oSpan.nPitch + static_cast<std::int64_t>(nCol) * oSpan.nChan,
+                   panOffset, first, second);
+    }
+
+    template <typename Parameters>
+    const Parameters& Get() const {
+        return *static_cast<const Parameters*>(oSpan.pParameters);
+    }
+    double* Scratch() const { return oSpan.padfScratch; }
 
     bool HasMask() const { return oSpan.pabyMask != nullptr; }
 
@@ -327,6 +348,12 @@ struct RootReader {
             p[j] = Root(p[j]);
         }
     }
+    F64 Sample(int nRow, int nCol) const { return Root(oWindow.Sample(nRow, nCol)); }
+    template <typename Parameters>
+    const Parameters& Get() const {
+        return oWindow.template Get<Parameters>();
+    }
+    double* Scratch() const { return oWindow.Scratch(); }
     bool HasMask() const { return oWindow.HasMask(); }
     template <int N>
     void MaskRow(int nRow, F64 (&p)[N]) const {
@@ -346,39 +373,64 @@ struct Squared {
     }
 };
 
-template <typename Method, typename T, bool kSingleChannel>
-void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
+template <typename T>
+inline void StoreValue(double* p, F64 value) {
+    if constexpr (kIsFloating<T>) {
+        // Which bits a NaN gets from arithmetic depends on the processor and on the order of
+        // operands, which a compiler may exchange.
+        value = Select(value == value, value, Set1(__builtin_nan("")));
+    }
+    Store(p, value);
+}
+
+// Calls fnGroup with the first pixel of each group of eight that has a window, the window reader
+// and the fractions.
+template <typename T, bool kSingleChannel, typename Function>
+inline void ForEachGroup(const WindowSpan& oSpan, const T* pSrc, const Function& fnGroup) {
     for (int i = 0; i < oSpan.nPix; i += kLanes) {
         if (oSpan.pabyMode != nullptr && !AnyByteEquals(oSpan.pabyMode + i, 1)) {
             continue;
         }
-        const F64 dx = Load(oSpan.padfFracCol + i);
-        const F64 dy = Load(oSpan.padfFracRow + i);
-        const WindowReader<T, kSingleChannel> oWindow{pSrc, oSpan.panOffset + i, oSpan};
-        F64 value;
-        if constexpr (sizeof(T) == 1 && kSingleChannel && Method::kSize == 2) {
-            const PairGroup* poGroup =
-                oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
-            value = poGroup != nullptr && poGroup->nOffset >= 0
-                        ? Method::Value(GroupReader<T>{pSrc, poGroup, oSpan.nPitch}, dx, dy)
-                        : Method::Value(oWindow, dx, dy);
-        } else {
-            value = Method::Value(oWindow, dx, dy);
-        }
-        if constexpr (kIsFloating<T>) {
-            // Which bits a NaN gets from arithmetic depends on the processor and on the order of
-            // operands, which a compiler may exchange.
-            value = Select(value == value, value, Set1(__builtin_nan("")));
-        }
-        Store(padfValue + i, value);
+        fnGroup(i, WindowReader<T, kSingleChannel>{pSrc, oSpan.panOffset + i, oSpan},
+                Load(oSpan.padfFracCol + i), Load(oSpan.padfFracRow + i));
     }
 }
 
+template <typename Method, typename T, bool kSingleChannel>
+void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
+    ForEachGroup<T, kSingleChannel>(
+        oSpan, pSrc, [&](int i, const WindowReader<T, kSingleChannel>& oWindow, F64 dx, F64 dy) {
+            if constexpr (sizeof(T) == 1 && kSingleChannel && Method::kSize == 2) {
+                const PairGroup* poGroup =
+                    oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
+                if (poGroup != nullptr && poGroup->nOffset >= 0) {
+                    const GroupReader<T> oGroup{pSrc, poGroup, oSpan.nPitch};
+                    StoreValue<T>(padfValue + i, Method::Value(oGroup, dx, dy));
+                    return;
+                }
+            }
+            StoreValue<T>(padfValue + i, Method::Value(oWindow, dx, dy));
+        });
+}
+
 template <typename Method, typename T>
-void Values(const WindowSpan& oSpan, const void* pSrc, const void*, double* padfValue) {
+void Values(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
     oSpan.nChan == 1 ? ValuesLoop<Method, T, true>(oSpan, p, padfValue)
                      : ValuesLoop<Method, T, false>(oSpan, p, padfValue);
+}
+
+// A method that makes one complex value out of the samples of two channels.
+template <typename Method, typename T>
+void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
+    ForEachGroup<T, false>(oSpan, static_cast<const T*>(pSrc),
+                           [&](int i, const WindowReader<T, false>& oWindow, F64 dx, F64 dy) {
+                               F64 re;
+                               F64 im;
+                               Method::Value(oWindow, dx, dy, re, im);
+                               StoreValue<T>(padfValue + i, re);
+                               StoreValue<T>(padfValue + kSpanArray + i, im);
+                           });
 }
 
 template <typename T, bool kNonNegative>
@@ -402,7 +454,9 @@ void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsign
 
 #include "vetra/base/utils/resample/algorithm/bilinear_inl.h"
 #include "vetra/base/utils/resample/algorithm/cubic_inl.h"
+#include "vetra/base/utils/resample/algorithm/kernel_inl.h"
 #include "vetra/base/utils/resample/algorithm/lagrange_inl.h"
+#include "vetra/base/utils/resample/algorithm/windowstatistics_inl.h"
 
 // ---- Stores ----
 
@@ -520,27 +574,23 @@ void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
 }  // namespace
 
 // One entry per sample type, in the order of the type codes.
-#define VETRA_PER_TYPE(Function)                                                                   \
-    {                                                                                              \
-        Function(unsigned char), Function(signed char), Function(unsigned short), Function(short), \
-            Function(unsigned int), Function(int), Function(float), Function(std::uint64_t),       \
-            Function(std::int64_t), Function(double)                                               \
+#define VETRA_PER_TYPE(Entry, ...)                                                             \
+    {                                                                                          \
+        Entry(__VA_ARGS__ unsigned char), Entry(__VA_ARGS__ signed char),                      \
+            Entry(__VA_ARGS__ unsigned short), Entry(__VA_ARGS__ short),                       \
+            Entry(__VA_ARGS__ unsigned int), Entry(__VA_ARGS__ int), Entry(__VA_ARGS__ float), \
+            Entry(__VA_ARGS__ std::uint64_t), Entry(__VA_ARGS__ std::int64_t),                 \
+            Entry(__VA_ARGS__ double)                                                          \
     }
-#define VETRA_PER_SHORT_INTEGER(Function)                                                          \
-    {                                                                                              \
-        Function(unsigned char), Function(signed char), Function(unsigned short), Function(short), \
-            Function(unsigned int), Function(int), nullptr, nullptr, nullptr, nullptr              \
+#define VETRA_PER_SHORT_INTEGER(Entry)                                                 \
+    {                                                                                  \
+        Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), \
+            Entry(unsigned int), Entry(int), nullptr, nullptr, nullptr, nullptr        \
     }
-#define VETRA_BILINEAR(T) &Values<Bilinear, T>
-#define VETRA_CUBIC(T) &Values<Cubic, T>
-#define VETRA_CUBICPS(T) &Values<CubicPs, T>
-#define VETRA_LAGRANGE4(T) &Values<Lagrange<LagrangeBasis4>, T>
-#define VETRA_LAGRANGE8(T) &Values<Lagrange<LagrangeBasis8>, T>
-#define VETRA_SQBILINEAR(T) &Values<Squared<Bilinear>, T>
-#define VETRA_SQCUBIC(T) &Values<Squared<Cubic>, T>
-#define VETRA_SQCUBICPS(T) &Values<Squared<CubicPs>, T>
-#define VETRA_SQLAGRANGE4(T) &Values<Squared<Lagrange<LagrangeBasis4>>, T>
-#define VETRA_SQLAGRANGE8(T) &Values<Squared<Lagrange<LagrangeBasis8>>, T>
+#define VETRA_VALUES(Method, T) &Values<Method, T>
+#define VETRA_COMPLEX_VALUES(Method, T) &ComplexValues<Method, T>
+#define VETRA_TWINS(Name, Method) \
+    VETRA_PER_TYPE(VETRA_VALUES, Method, ), VETRA_PER_TYPE(VETRA_VALUES, Squared<Method>, ),
 #define VETRA_NEAREST(T) &NearestValues<T, false>
 #define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
@@ -560,18 +610,7 @@ const LevelStages kStages = {
     &OpenModes,
     &Windows,
     &NearestPlaces,
-    {
-        VETRA_PER_TYPE(VETRA_BILINEAR),
-        VETRA_PER_TYPE(VETRA_CUBIC),
-        VETRA_PER_TYPE(VETRA_CUBICPS),
-        VETRA_PER_TYPE(VETRA_LAGRANGE4),
-        VETRA_PER_TYPE(VETRA_LAGRANGE8),
-        VETRA_PER_TYPE(VETRA_SQBILINEAR),
-        VETRA_PER_TYPE(VETRA_SQCUBIC),
-        VETRA_PER_TYPE(VETRA_SQCUBICPS),
-        VETRA_PER_TYPE(VETRA_SQLAGRANGE4),
-        VETRA_PER_TYPE(VETRA_SQLAGRANGE8),
-    },
+    {VETRA_VALUES_ROWS(VETRA_TWINS) VETRA_PER_TYPE(VETRA_COMPLEX_VALUES, CplxSar, )},
     VETRA_PER_TYPE(VETRA_NEAREST),
     VETRA_PER_TYPE(VETRA_NONNEGATIVE),
     VETRA_PER_TYPE(VETRA_STORE),

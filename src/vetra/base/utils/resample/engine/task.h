@@ -15,6 +15,10 @@ struct Method {
     ValuesRow eValues;
     /// Negative nearest samples count as 0.
     bool bNonNegative;
+    /// Channels whose values come out of one call of the values stage.
+    int nChannels = 1;
+    /// Doubles of working memory for each pixel of a window, for each of kLanes pixels at once.
+    int nScratch = 0;
 };
 
 /// What a run can be asked for beyond its result. The defaults are what every caller gets; tests
