@@ -24,6 +24,8 @@
 #include "vetra/base/utils/resample/resamplebuffer.h"
 #include "vetra/base/utils/resample/resampleinfo.h"
 #include "vetra/base/utils/resample/resampleutils.h"
+#include "vetra/base/utils/string/itokenizer.h"
+#include "vetra/base/utils/string/stringtokenizer.h"
 #include "vetra/base/utils/string/stringutils.h"
 #include "vetra/basic/gobs/raster/datatypeadapter.h"
 #include "vetra/export.h"

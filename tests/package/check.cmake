@@ -34,11 +34,14 @@ if(SHARED_LIBRARY)
     execute_process(COMMAND ${NM} -D --defined-only ${SHARED_LIBRARY} OUTPUT_VARIABLE symbols
         COMMAND_ERROR_IS_FATAL ANY)
     string(REGEX MATCHALL "[A-Za-z] _?[^ \n]+" symbols "${symbols}")
-    # Mangled names: the namespace vetra without its private part, the global functions and the
-    # global class, and weak instances of the standard library's templates.
-    set(functions "FormatString|TrimWhitespace|IsNumeric|TextToDouble|ChooseResampleMode(ForFilter)?")
+    # Mangled names: the namespace vetra without its private part, the global functions and
+    # classes, and weak instances of the standard library's templates.
+    set(functions "FormatString|ChooseResampleMode|ChooseResampleModeForFilter")
+    string(APPEND functions "|TrimWhitespace|IsNumeric|TextToDouble|CollapseWhitespace|ToLower|ToUpper|Strip")
+    string(APPEND functions "|CountChar|FindAndReplace|HashString|NumDigits|TokenizeString")
+    set(classes "22CaseInsensitiveCompare|10ITokenizer|15StringTokenizer")
     set(public "[A-Z] _Z(T[VIS])?NK?5vetra|T _Z[0-9]+(${functions})[a-zA-Z]")
-    string(APPEND public "|[A-Z] _Z(T[VIS])?(NK?)?22CaseInsensitiveCompare")
+    string(APPEND public "|[A-Z] _Z(T[VIS])?(NK?)?(${classes})")
     set(standard "[WVu] _ZZ?(T[VIS])?(NK?)?(St|S[abdios]|9__gnu_cxx)")
     foreach(symbol IN LISTS symbols)
         if(NOT symbol MATCHES "^(${public}|${standard})" OR symbol MATCHES "6engine|_GLOBAL__N_")

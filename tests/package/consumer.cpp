@@ -77,6 +77,7 @@ int main() {
               ChooseResampleModeForFilter(1, nullptr, 3, 1, 5.0, 0.0, 0, 0, 1, 1, eNFA_NN) == 0,
           "modes");
     Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
+    Check(StringTokenizer("a b").CountTokens() == 2 && HashString("") == 1339080641, "tokens");
     Check(FormatString("%d.%d.%d", VETRA_VERSION_MAJOR, VETRA_VERSION_MINOR, VETRA_VERSION_PATCH) ==
               VETRA_VERSION,
           "version");

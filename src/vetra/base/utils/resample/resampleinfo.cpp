@@ -1,25 +1,13 @@
 #include "vetra/base/utils/resample/resampleinfo.h"
 
 #include <algorithm>
-#include <string_view>
 
 #include "vetra/base/utils/string/stringutils.h"
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"
 
-namespace {
-
-unsigned char ToLower(char c) {
-    return static_cast<unsigned char>(c >= 'A' && c <= 'Z' ? c - 'A' + 'a' : c);
-}
-
-}  // namespace
-
 bool CaseInsensitiveCompare::operator()(const std::string& a, const std::string& b) const {
-    const std::string_view sA = a.c_str();
-    const std::string_view sB = b.c_str();
-    return std::lexicographical_compare(sA.begin(), sA.end(), sB.begin(), sB.end(),
-                                        [](char cA, char cB) { return ToLower(cA) < ToLower(cB); });
+    return ToLower(a.c_str()) < ToLower(b.c_str());
 }
 
 namespace vetra::utils {
