@@ -71,12 +71,20 @@ TEST(RasterResampler, AllClasses) {
     const Geometry kTwo = {0, 0, 2, 2, 0, 0, 0, 0, 1, 1};
     const Geometry kFour = {-1, -1, 4, 4, 0, 0, -1, -1, 2, 2};
     const Geometry kEight = {-3, -3, 8, 8, 0, 0, -3, -3, 4, 4};
+    const Geometry kSixteen = {-7, -7, 16, 16, 0, 0, -7, -7, 8, 8};
     const Geometry kThreeFive = {0, 0, 3, 5, 1, 1, 0, 0, 3, 5};
+    const Geometry kFourFive = {-1, -2, 4, 5, 0, 0, -1, -2, 2, 2};
     const CoefficientMap oWindow = {{"NUMCOLS", "3"}, {"NUMROWS", "5"}};
     CheckClass<BilinearResampler>(0, kTwo, {});
     CheckClass<CubicResampler>(1, kFour, {});
     CheckClass<CubicPsResampler>(2, kFour, {});
     CheckClass<NearestResampler>(3, kOne, {});
+    ShapingWindow oKaiser, oHann;
+    oKaiser.SetKaiser(2.5);
+    oHann.SetHann();
+    CheckClass<Sinc8Resampler>(4, kEight, {{"SHAPINGWINDOW", "KAISER"}, {"BETA", "2.500000"}},
+                               oKaiser);
+    CheckClass<Sinc16Resampler>(5, kSixteen, {{"SHAPINGWINDOW", "HANN"}}, oHann);
     CheckClass<AverageResampler>(6, kThreeFive, oWindow, 3, 5);
     CheckClass<MedianResampler>(7, kThreeFive, oWindow, 3, 5);
     CheckClass<CplxSarResampler>(
@@ -84,14 +92,36 @@ TEST(RasterResampler, AllClasses) {
         {{"NUMCOLS", "5"}, {"NUMROWS", "7"}, {"FC", "  2.5000000000000000e-01"}}, 5, 7, 0.25);
     CheckClass<Lagrange4Resampler>(9, kFour, {});
     CheckClass<Lagrange8Resampler>(10, kEight, {});
+    const CoefficientMap oGaussian = {
+        {"NUMCOLS", "4"}, {"NUMROWS", "5"}, {"SIGMACOL", "0.500000"}, {"SIGMAROW", "1.250000"}};
+    CheckClass<GaussianResampler>(11, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
     CheckClass<SqBilinearResampler>(13, kTwo, {});
     CheckClass<SqCubicResampler>(14, kFour, {});
     CheckClass<SqCubicPsResampler>(15, kFour, {});
     CheckClass<SqNearestResampler>(16, kOne, {});
+    CheckClass<SqSinc8Resampler>(17, kEight, {{"SHAPINGWINDOW", "HANN"}}, oHann);
+    CheckClass<SqSinc16Resampler>(18, kSixteen, {{"SHAPINGWINDOW", "KAISER"}, {"BETA", "2.500000"}},
+                                  oKaiser);
     CheckClass<SqAverageResampler>(19, kThreeFive, oWindow, 3, 5);
     CheckClass<SqMedianResampler>(20, kThreeFive, oWindow, 3, 5);
     CheckClass<SqLagrange4Resampler>(21, kFour, {});
     CheckClass<SqLagrange8Resampler>(22, kEight, {});
+    CheckClass<SqGaussianResampler>(23, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
+}
+
+TEST(RasterResampler, SincWeights) {
+    ShapingWindow oWindow;
+    oWindow.SetLanczos();
+    ResampleInfo oEight, oSixteen;
+    Sinc8Resampler::GenerateKernelWeights(oWindow, oEight);
+    Sinc16Resampler::GenerateKernelWeights(oWindow, oSixteen);
+    const auto fnWeights = [](const IRasterResampler& oResampler) {
+        return oResampler.GetResampleInfo().mvdfKernelWeights;
+    };
+    EXPECT_EQ(fnWeights(Sinc8Resampler(oWindow)), oEight.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(SqSinc8Resampler(oWindow)), oEight.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(Sinc16Resampler(oWindow)), oSixteen.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(SqSinc16Resampler(oWindow)), oSixteen.mvdfKernelWeights);
 }
 
 template <typename R>

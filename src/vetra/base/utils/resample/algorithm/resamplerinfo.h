@@ -35,6 +35,22 @@ void CheckCplxSarSize(int nWndNumCols, int nWndNumRows, const char* pszFile,
 void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunction,
                            std::uint32_t nLine);
 
+/// How the messages of a Gaussian resampler name it.
+struct GaussianTexts {
+    const char* pszCols;
+    const char* pszRows;
+    const char* pszSigma;
+};
+constexpr GaussianTexts kGaussianTexts{"gaussian", "gaussian", "gaussian"};
+/// Their odd spellings are what callers know.
+constexpr GaussianTexts kSqGaussianTexts{"guassian", "gaussian", "Gaussian"};
+
+/// Refuses a window of less than one column or row, then a sigma that is not above 0 or not finite,
+/// columns first, with `ParameterException`.
+void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSigmaRow,
+                   const GaussianTexts& oTexts, const char* pszFile, const char* pszFunction,
+                   std::uint32_t nLine);
+
 /// Refuses a window of less than one column or row, then a number of sub-pixels below 0, with
 /// `ParameterException`.
 void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,
