@@ -138,7 +138,9 @@ struct PlainMethod {
             case eRM_CPLXSAR:
                 oInfo.GetCoefficientInt("NUMCOLS", nCols, true);
                 oInfo.GetCoefficientInt("NUMROWS", nRows, true);
-                oInfo.GetCoefficientInt("NUMSUBPIXELS", nSubPixels, false);
+                if (eMethod == eRM_KERNEL) {
+                    oInfo.GetCoefficientInt("NUMSUBPIXELS", nSubPixels, true);
+                }
                 oInfo.GetCoefficientDouble("FC", dfFc, false);
                 bAnchorNearest = eMethod != eRM_GAUSSIAN && eMethod != eRM_KERNEL;
                 break;
