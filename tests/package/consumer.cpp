@@ -75,7 +75,9 @@ int main() {
         std::make_unique<Sinc16Resampler>(oWindow),
         std::make_unique<SqSinc16Resampler>(oWindow),
         std::make_unique<GaussianResampler>(1.0f, 1.0f),
-        std::make_unique<SqGaussianResampler>(1.0f, 1.0f)};
+        std::make_unique<SqGaussianResampler>(1.0f, 1.0f),
+        std::make_unique<KernelResampler>(1, 1, 0, std::vector<double>(2, 1.0)),
+        std::make_unique<SqKernelResampler>(1, 1, 0, std::vector<double>(2, 1.0))};
     for (const auto& poResampler : apoResamplers) {
         Check(BlockPlanner(oArray, 3, 1, *poResampler, 1, 1).GetNumBlocks() == 1, "blocks");
     }

@@ -1,7 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <array>
 #include <limits>
 #include <memory>
+#include <typeinfo>
 #include <vector>
 
 #include "tests/support/refusal.h"
@@ -95,6 +97,9 @@ TEST(RasterResampler, AllClasses) {
     const CoefficientMap oGaussian = {
         {"NUMCOLS", "4"}, {"NUMROWS", "5"}, {"SIGMACOL", "0.500000"}, {"SIGMAROW", "1.250000"}};
     CheckClass<GaussianResampler>(11, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
+    const CoefficientMap oKernel = {{"NUMCOLS", "4"}, {"NUMROWS", "5"}, {"NUMSUBPIXELS", "2"}};
+    const std::vector<double> vdfWeights(9 * 3, 0.25);
+    CheckClass<KernelResampler>(12, kFourFive, oKernel, 4, 5, 2, vdfWeights);
     CheckClass<SqBilinearResampler>(13, kTwo, {});
     CheckClass<SqCubicResampler>(14, kFour, {});
     CheckClass<SqCubicPsResampler>(15, kFour, {});
@@ -107,6 +112,7 @@ TEST(RasterResampler, AllClasses) {
     CheckClass<SqLagrange4Resampler>(21, kFour, {});
     CheckClass<SqLagrange8Resampler>(22, kEight, {});
     CheckClass<SqGaussianResampler>(23, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
+    CheckClass<SqKernelResampler>(24, kFourFive, oKernel, 4, 5, 2, vdfWeights);
 }
 
 TEST(RasterResampler, SincWeights) {
@@ -170,6 +176,47 @@ TEST(RasterResampler, CplxSar) {
     }
     EXPECT_THROW(CplxSarResampler(5, 7, std::numeric_limits<double>::quiet_NaN()),
                  ParameterException);
+}
+
+template <typename R>
+void CheckKernels() {
+    const std::vector<double> vdfWeights = {1.0, 0.25, 0.5, 0.75};
+    EXPECT_EQ(R(1, 1, 1, vdfWeights).GetResampleInfo().mvdfKernelWeights, vdfWeights);
+    EXPECT_EQ(R(3, 1, 0, vdfWeights).GetResampleInfo().mvdfKernelWeights, vdfWeights);
+    constexpr int kMost = std::numeric_limits<int>::max();
+    for (const int nSize : {0, -3, -kMost - 1}) {
+        const std::string sSize = std::to_string(nSize);
+        const std::string sRest = " for kernel resampler must be a non-zero positive number";
+        ExpectRefusal({"nWndNumCols", 1, sSize, "Non-zero positive number", "Num cols" + sRest},
+                      [&] { R(nSize, nSize, -1, vdfWeights); });
+        ExpectRefusal({"nWndNumRows", 1, sSize, "Non-zero positive number", "Num rows" + sRest},
+                      [&] { R(1, nSize, -1, vdfWeights); });
+    }
+    for (const int nSubPixels : {-1, -kMost - 1}) {
+        ExpectRefusal({"nSubPixels", 1, std::to_string(nSubPixels), "Positive number",
+                       "Num of subpixels for kernel resampler must be a positive number"},
+                      [&] { R(1, 1, nSubPixels, vdfWeights); });
+    }
+    // One weight too few, one too many, none, and products that are 0 in 32 or 64 bits.
+    for (const auto& anSizes : {std::array{2, 3, 0},
+                                {1, 2, 0},
+                                {4, 4, 4},
+                                {1 << 30, 1 << 30, 1},
+                                {kMost, kMost, kMost}}) {
+        try {
+            R(anSizes[0], anSizes[1], anSizes[2], vdfWeights);
+            ADD_FAILURE() << anSizes[0];
+        } catch (const DataException& oCaught) {
+            EXPECT_TRUE(typeid(oCaught) == typeid(DataException));
+            EXPECT_EQ(oCaught.GetMessage(),
+                      "Resampler kernel does not have correct number of weights.");
+        }
+    }
+}
+
+TEST(RasterResampler, Kernels) {
+    CheckKernels<KernelResampler>();
+    CheckKernels<SqKernelResampler>();
 }
 
 // A caller's own class, whose axes have different anchors.

@@ -19,6 +19,12 @@ CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows) {
             {"NUMROWS", FormatString("%d", nWndNumRows)}};
 }
 
+CoefficientMap KernelCoefficients(int nWndNumCols, int nWndNumRows, int nSubPixels) {
+    CoefficientMap oCoefficients = WindowCoefficients(nWndNumCols, nWndNumRows);
+    oCoefficients["NUMSUBPIXELS"] = FormatString("%d", nSubPixels);
+    return oCoefficients;
+}
+
 namespace {
 
 struct SizeRule {

@@ -16,6 +16,9 @@ ResampleInfo MethodInfo(ResampleMethod eMethod, const CoefficientMap& oCoefficie
 /// The coefficients "NUMCOLS" and "NUMROWS".
 CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows);
 
+/// The coefficients "NUMCOLS", "NUMROWS" and "NUMSUBPIXELS".
+CoefficientMap KernelCoefficients(int nWndNumCols, int nWndNumRows, int nSubPixels);
+
 /// Sub-pixel phases of the tables that this library makes: a fraction's phases are 0 to 64.
 constexpr int kTabulatedSubPixels = 64;
 
@@ -55,6 +58,13 @@ void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSig
 /// `ParameterException`.
 void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,
                      const char* pszFunction, std::uint32_t nLine);
+
+/// The number of weights of kernels of both axes. No sizes that `CheckKernelSize` lets pass
+/// overflow.
+constexpr long long NumKernelWeights(int nWndNumCols, int nWndNumRows, int nSubPixels) {
+    return (static_cast<long long>(nWndNumCols) + nWndNumRows) *
+           (static_cast<long long>(nSubPixels) + 1);
+}
 
 /// Refuses fewer weights than a method reads, with `ParameterException`.
 void CheckNumWeights(const std::vector<double>& vdfWeights, long long nNeeded, const char* pszFile,
