@@ -2,6 +2,7 @@
 #define VETRA_VETRA_H
 
 /// Every public header.
+#include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
