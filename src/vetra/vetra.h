@@ -9,6 +9,7 @@
 #include "vetra/base/utils/resample/algorithm/cplxsarresampler.h"
 #include "vetra/base/utils/resample/algorithm/cubicpsresampler.h"
 #include "vetra/base/utils/resample/algorithm/cubicresampler.h"
+#include "vetra/base/utils/resample/algorithm/kernelfile.h"
 #include "vetra/base/utils/resample/algorithm/lagrange4resampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange8resampler.h"
 #include "vetra/base/utils/resample/algorithm/medianresampler.h"
