@@ -11,6 +11,7 @@
 #include "vetra/base/utils/resample/algorithm/cubicresampler.h"
 #include "vetra/base/utils/resample/algorithm/gaussiankernel.h"
 #include "vetra/base/utils/resample/algorithm/gaussianresampler.h"
+#include "vetra/base/utils/resample/algorithm/kernelfile.h"
 #include "vetra/base/utils/resample/algorithm/kernelresampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange4resampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange8resampler.h"
