@@ -152,7 +152,7 @@ TEST(FileUtils, RemoveFile) {
     EXPECT_FALSE(IsFile(sFile));
 }
 
-// The two orders as stated, call within call.
+// The two orders, call within call.
 Paths PlainFind(const std::string& sFolder, const std::string& sSuffix) {
     Paths vsFound;
     for (const fs::directory_entry& oEntry : fs::directory_iterator(sFolder)) {

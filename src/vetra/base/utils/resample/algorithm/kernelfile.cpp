@@ -174,7 +174,7 @@ void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
     for (; eField == KernelText::Field::eNumber; eField = oText.ReadField(sField)) {
         // What is too much is read to its end, for a later failure, and not kept.
         if (nCount < nTotal) {
-            vdfWeights.push_back(TextToDouble(sField.substr(0, sField.find_first_of("Dd"))));
+            vdfWeights.push_back(TextToDouble(sField));
         }
         ++nCount;
     }
