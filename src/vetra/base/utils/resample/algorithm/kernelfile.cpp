@@ -164,7 +164,8 @@ void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
     nRows = bSingleKernel ? 0 : HeaderNumber(vsHeader[1]);
     nSubPixels = HeaderNumber(vsHeader.back());
     const std::int64_t nTotal = NumWeights(nCols, nRows, nSubPixels);
-    if (nTotal < 0 || static_cast<std::uint64_t>(nTotal) > vdfWeights.max_size()) {
+    // A negative number becomes a large one.
+    if (static_cast<std::uint64_t>(nTotal) > vdfWeights.max_size()) {
         throw std::length_error("vector<T> too long");
     }
 
