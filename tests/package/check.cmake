@@ -37,6 +37,7 @@ if(SHARED_LIBRARY)
     # Mangled names: the namespace vetra without its private part, the global functions and
     # classes, and weak instances of the standard library's templates.
     set(functions "FormatString|ChooseResampleMode|ChooseResampleModeForFilter")
+    string(APPEND functions "|GetShapingWindow|GenerateGaussianKernel")
     string(APPEND functions "|TrimWhitespace|IsNumeric|TextToDouble|CollapseWhitespace|ToLower|ToUpper|Strip")
     string(APPEND functions "|CountChar|FindAndReplace|HashString|NumDigits|TokenizeString")
     set(classes "22CaseInsensitiveCompare|10ITokenizer|15StringTokenizer")
