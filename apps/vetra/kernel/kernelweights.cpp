@@ -70,15 +70,15 @@ std::vector<double> SampleAxis(ResampleInfo oInfo, Axis eAxis, const AxisWindow&
     const ResampleBuffer oSrc = Oriented(nAlong, nAcross, vdfSource);
     ResampleBuffer oTgt = Oriented(nPositions, 1, vdfResponse);
     if (eAxis == eAxisCols) {
-        utils::Resample(oSrc, oTgt,
-                        utils::BufPosScaleOffTfm(nPositions, 1, dfStep, dfEdge, 1.0,
-                                                 -oOther.nFirst, 0, 0),
-                        oInfo);
+        utils::Resample(
+            oSrc, oTgt,
+            utils::BufPosScaleOffTfm(nPositions, 1, dfStep, dfEdge, 1.0, -oOther.nFirst, 0, 0),
+            oInfo);
     } else {
-        utils::Resample(oSrc, oTgt,
-                        utils::BufPosScaleOffTfm(1, nPositions, 1.0, -oOther.nFirst, dfStep, dfEdge,
-                                                 0, 0),
-                        oInfo);
+        utils::Resample(
+            oSrc, oTgt,
+            utils::BufPosScaleOffTfm(1, nPositions, 1.0, -oOther.nFirst, dfStep, dfEdge, 0, 0),
+            oInfo);
     }
 
     std::vector<double> vdfWeights;
@@ -115,8 +115,7 @@ KernelWeights SampleMethod(const IRasterResampler& oResampler, ResampleMethod eM
 }  // namespace
 
 bool KernelWeights::HasOneKernel() const {
-    const auto oMiddle =
-        vdfWeights.begin() + static_cast<std::ptrdiff_t>(nSubPixels + 1) * nCols;
+    const auto oMiddle = vdfWeights.begin() + static_cast<std::ptrdiff_t>(nSubPixels + 1) * nCols;
     return nCols == nRows && std::equal(vdfWeights.begin(), oMiddle, oMiddle);
 }
 
@@ -147,11 +146,13 @@ KernelWeights GetKernelWeights(const IRasterResampler& oResampler) {
                                        oInfo.mvdfKernelWeights.end());
             return oWeights;
         case eRM_MEDIAN:
-            throw UsageError(sName + " takes one of the pixels and doesn't weigh them: it has no "
-                                     "weights to write or draw");
+            throw UsageError(sName +
+                             " takes one of the pixels and doesn't weigh them: it has no "
+                             "weights to write or draw");
         case eRM_CPLXSAR:
-            throw UsageError(sName + " has complex weights, which a kernel file can't hold (--plot "
-                                     "draws them)");
+            throw UsageError(sName +
+                             " has complex weights, which a kernel file can't hold (--plot "
+                             "draws them)");
         default:
             return SampleMethod(oResampler, eMethod);
     }

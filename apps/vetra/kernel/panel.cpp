@@ -10,14 +10,40 @@ namespace vetra::tool {
 
 namespace {
 
-// Where a curve has many points to one place across, the first, the lowest, the highest and the
-// last of them look the same as all.
+// Of the points between two, those that a line from one to the other misses by more than can be
+// seen, and of what they leave again those.
+void KeepBends(const std::vector<Point>& oPoints, std::size_t nFirst, std::size_t nLast,
+               std::vector<Point>& oKept) {
+    const Point& a = oPoints[nFirst];
+    const Point oStep = {oPoints[nLast].dfX - a.dfX, oPoints[nLast].dfY - a.dfY};
+    const double dfLength = std::hypot(oStep.dfX, oStep.dfY);
+    std::size_t nFarthest = nFirst;
+    double dfFarthest = 0.05;
+    for (std::size_t n = nFirst + 1; n < nLast; ++n) {
+        const Point o = {oPoints[n].dfX - a.dfX, oPoints[n].dfY - a.dfY};
+        const double dfMissed = dfLength > 0.0
+                                    ? std::abs(oStep.dfX * o.dfY - oStep.dfY * o.dfX) / dfLength
+                                    : std::hypot(o.dfX, o.dfY);
+        if (dfMissed > dfFarthest) {
+            dfFarthest = dfMissed;
+            nFarthest = n;
+        }
+    }
+    if (nFarthest != nFirst) {
+        KeepBends(oPoints, nFirst, nFarthest, oKept);
+        oKept.push_back(oPoints[nFarthest]);
+        KeepBends(oPoints, nFarthest, nLast, oKept);
+    }
+}
+
+// A curve with as few points as it takes to look the same. Where many points have one place across,
+// the first, the lowest, the highest and the last of them will do.
 std::vector<Point> Thin(const std::vector<Point>& oPoints) {
     const auto SamePlace = [](const Point& a, const Point& b) {
         return std::lround(2.0 * a.dfX) == std::lround(2.0 * b.dfX);
     };
     const auto Lower = [](const Point& a, const Point& b) { return a.dfY < b.dfY; };
-    std::vector<Point> oKept;
+    std::vector<Point> oFew;
     for (auto oFirst = oPoints.begin(); oFirst != oPoints.end();) {
         const auto oEnd = std::find_if_not(oFirst, oPoints.end(),
                                            [&](const Point& o) { return SamePlace(o, *oFirst); });
@@ -25,10 +51,13 @@ std::vector<Point> Thin(const std::vector<Point>& oPoints) {
         std::vector oOrder = {oFirst, std::min(oLow, oHigh), std::max(oLow, oHigh), oEnd - 1};
         oOrder.erase(std::unique(oOrder.begin(), oOrder.end()), oOrder.end());
         for (const auto& o : oOrder) {
-            oKept.push_back(*o);
+            oFew.push_back(*o);
         }
         oFirst = oEnd;
     }
+    std::vector<Point> oKept = {oFew.front()};
+    KeepBends(oFew, 0, oFew.size() - 1, oKept);
+    oKept.push_back(oFew.back());
     return oKept;
 }
 
@@ -50,25 +79,18 @@ AxisRange MakeRange(double dfFirst, double dfLast, int nTicks, const std::string
             dfTick = dfDigit * dfPower;
         }
     }
-    return {dfTick * std::floor(dfFirst / dfTick), dfTick * std::ceil(dfLast / dfTick), dfTick,
-            sTitle, true};
+    return {dfFirst, dfLast, dfTick, sTitle, true};
 }
 
-Panel::Panel(SvgPicture& oPicture, Point oCorner, double dfWidth, double dfHeight, AxisRange oX,
-             AxisRange oY)
-    : moPicture(oPicture),
-      moCorner(oCorner),
-      mdfWidth(dfWidth),
-      mdfHeight(dfHeight),
-      moX(std::move(oX)),
-      moY(std::move(oY)) {}
+Panel::Panel(SvgPicture& oPicture, const PanelArea& oArea, AxisRange oX, AxisRange oY)
+    : moPicture(oPicture), moArea(oArea), moX(std::move(oX)), moY(std::move(oY)) {}
 
 Point Panel::Place(Point oPoint) const {
     const auto Part = [](double df, const AxisRange& oRange) {
         return std::clamp((df - oRange.dfFirst) / (oRange.dfLast - oRange.dfFirst), 0.0, 1.0);
     };
-    return {moCorner.dfX + mdfWidth * Part(oPoint.dfX, moX),
-            moCorner.dfY + mdfHeight * (1.0 - Part(oPoint.dfY, moY))};
+    return {moArea.oCorner.dfX + moArea.dfWidth * Part(oPoint.dfX, moX),
+            moArea.oCorner.dfY + moArea.dfHeight * (1.0 - Part(oPoint.dfY, moY))};
 }
 
 void Panel::Shade(double dfFirstX, double dfLastX) {
@@ -94,12 +116,14 @@ void Panel::DrawAxes() {
         const Point oPlace = Place({moX.dfFirst, dfY});
         moPicture.AddText({oPlace.dfX - 6, oPlace.dfY + 4}, FormatString("%g", dfY), "tick left");
     }
-    moPicture.AddRectangle(moCorner, mdfWidth, mdfHeight, "frame");
+    moPicture.AddRectangle(moArea.oCorner, moArea.dfWidth, moArea.dfHeight, "frame");
     if (moX.bLabels) {
-        moPicture.AddText({moCorner.dfX + mdfWidth / 2, moCorner.dfY + mdfHeight + 34}, moX.sTitle,
-                          "axis");
+        moPicture.AddText(
+            {moArea.oCorner.dfX + moArea.dfWidth / 2, moArea.oCorner.dfY + moArea.dfHeight + 34},
+            moX.sTitle, "axis");
     }
-    moPicture.AddTextUpwards({moCorner.dfX - 44, moCorner.dfY + mdfHeight / 2}, moY.sTitle, "axis");
+    moPicture.AddTextUpwards({moArea.oCorner.dfX - 44, moArea.oCorner.dfY + moArea.dfHeight / 2},
+                             moY.sTitle, "axis");
 }
 
 void Panel::DrawCurve(const std::vector<Point>& oPoints, const char* pszClass) {
@@ -110,8 +134,9 @@ void Panel::DrawCurve(const std::vector<Point>& oPoints, const char* pszClass) {
     moPicture.AddLines(Thin(oPlaces), pszClass);
 }
 
-void Panel::DrawText(Point oPlace, const std::string& sText, const char* pszClass) {
-    moPicture.AddText(Place(oPlace), sText, pszClass);
+void Panel::DrawHead(double dfX, const std::string& sText) {
+    const Point oPlace = Place({dfX, moY.dfLast});
+    moPicture.AddText({oPlace.dfX, oPlace.dfY - 8}, sText, "axis");
 }
 
 }  // namespace vetra::tool

@@ -17,30 +17,35 @@ struct AxisRange {
     bool bLabels = true;
 };
 
-/// The range from \p dfFirst to \p dfLast, widened to whole ticks of 1, 2 or 5 times a power of
-/// ten. \param nTicks  about how many
+/// A range with at most \p nTicks distances of ticks, which are 1, 2 or 5 times a power of ten.
 AxisRange MakeRange(double dfFirst, double dfLast, int nTicks, const std::string& sTitle);
+
+/// A rectangle of a picture.
+struct PanelArea {
+    Point oCorner;
+    double dfWidth;
+    double dfHeight;
+};
 
 /// A diagram in a rectangle of a picture. Points are in the units of its axes; what lies outside
 /// is drawn on the edge.
 class Panel {
  public:
-    Panel(SvgPicture& oPicture, Point oCorner, double dfWidth, double dfHeight, AxisRange oX,
-          AxisRange oY);
+    /// \param oArea  of the frame; titles and numbers stand to the left of it and below
+    Panel(SvgPicture& oPicture, const PanelArea& oArea, AxisRange oX, AxisRange oY);
 
     void Shade(double dfFirstX, double dfLastX);
     /// Draws frame, ticks and titles: after shades, before curves.
     void DrawAxes();
     void DrawCurve(const std::vector<Point>& oPoints, const char* pszClass);
-    void DrawText(Point oPlace, const std::string& sText, const char* pszClass);
+    /// Writes above the frame.
+    void DrawHead(double dfX, const std::string& sText);
 
  private:
     Point Place(Point oPoint) const;
 
     SvgPicture& moPicture;
-    Point moCorner;
-    double mdfWidth;
-    double mdfHeight;
+    PanelArea moArea;
     AxisRange moX;
     AxisRange moY;
 };
