@@ -84,8 +84,12 @@ std::vector<Series> GetSeries(const MethodFilters& oFilters,
 std::string Gain(double dfGain) {
     // Below are the zeros of a response, up to rounding.
     const double dfLeast = 1e-6;
-    return dfGain < dfLeast ? FormatString("0 (below %.0f dB)", ToDecibels(dfLeast))
-                            : FormatString("%.3f (%.1f dB)", dfGain, ToDecibels(dfGain));
+    if (dfGain < dfLeast) {
+        return FormatString("0 (below %.0f dB)", ToDecibels(dfLeast));
+    }
+    // The sum turns -0 into 0.
+    const double dfTenths = std::round(10.0 * ToDecibels(dfGain)) + 0.0;
+    return FormatString("%.3f (%.1f dB)", dfGain, dfTenths / 10.0);
 }
 
 // Also says which curve is which.
