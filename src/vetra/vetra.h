@@ -2,6 +2,7 @@
 #define VETRA_VETRA_H
 
 /// Every public header.
+#include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
@@ -10,6 +11,7 @@
 #include "vetra/base/utils/resample/algorithm/cubicresampler.h"
 #include "vetra/base/utils/resample/algorithm/gaussiankernel.h"
 #include "vetra/base/utils/resample/algorithm/gaussianresampler.h"
+#include "vetra/base/utils/resample/algorithm/kernelfile.h"
 #include "vetra/base/utils/resample/algorithm/kernelresampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange4resampler.h"
 #include "vetra/base/utils/resample/algorithm/lagrange8resampler.h"

@@ -99,6 +99,14 @@ int main() {
           "modes");
     Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
     Check(StringTokenizer("a b").CountTokens() == 2 && HashString("") == 1339080641, "tokens");
+    std::vector<double> vdfWeights(2, 0.5);
+    SaveKernelFile("kernel.txt", 1, 1, 0, vdfWeights, false);
+    int nKernelCols = 0, nKernelRows = 0, nSubPixels = 7;
+    LoadKernelFile("kernel.txt", nKernelCols, nKernelRows, nSubPixels, vdfWeights);
+    Check(nKernelCols == 1 && nKernelRows == 1 && nSubPixels == 0, "kernel file");
+    Check(FindFilesByWildcard("", "kernel.tx?", false).size() == 1, "found files");
+    RemoveFile("kernel.txt");
+    Check(!IsFile("kernel.txt"), "removed file");
     Check(FormatString("%d.%d.%d", VETRA_VERSION_MAJOR, VETRA_VERSION_MINOR, VETRA_VERSION_PATCH) ==
               VETRA_VERSION,
           "version");
