@@ -30,6 +30,7 @@
 #include "vetra/base/utils/resample/resample.h"
 #include "vetra/base/utils/resample/resamplebuffer.h"
 #include "vetra/base/utils/resample/resampleinfo.h"
+#include "vetra/base/utils/resample/resamplerfactory.h"
 #include "vetra/base/utils/resample/resampleutils.h"
 #include "vetra/base/utils/resample/shapingwindow.h"
 #include "vetra/base/utils/string/itokenizer.h"

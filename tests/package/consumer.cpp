@@ -81,6 +81,8 @@ int main() {
     for (const auto& poResampler : apoResamplers) {
         Check(BlockPlanner(oArray, 3, 1, *poResampler, 1, 1).GetNumBlocks() == 1, "blocks");
     }
+    const std::unique_ptr<IRasterResampler> poMade(ResamplerFactory().GetResampler("8pt,min=0"));
+    Check(poMade->GetResampleType() == ResamplerFactory::NameToMethod("SINC8"), "factory");
     std::vector<double> vdfWeights;
     GenerateGaussianKernel(1, 2, 1.0f, 1.0f, vdfWeights);
     Check(vdfWeights.size() == 65 * 3, "Gaussian kernels");
@@ -99,7 +101,6 @@ int main() {
           "modes");
     Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
     Check(StringTokenizer("a b").CountTokens() == 2 && HashString("") == 1339080641, "tokens");
-    std::vector<double> vdfWeights(2, 0.5);
     SaveKernelFile("kernel.txt", 1, 1, 0, vdfWeights, false);
     int nKernelCols = 0, nKernelRows = 0, nSubPixels = 7;
     LoadKernelFile("kernel.txt", nKernelCols, nKernelRows, nSubPixels, vdfWeights);

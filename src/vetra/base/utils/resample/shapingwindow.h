@@ -29,7 +29,7 @@ class VETRA_EXPORT ShapingWindow {
     void SetHamming();
     void SetLanczos();
     /// \param dfSigma  standard deviation in half widths of the window; the sign has no effect. Not
-    ///                 checked: with 0, and below about 0.01, a sinc table has no weight left and
+    ///                 checked: with 0, and below about 0.003, a sinc table has no weight left and
     ///                 holds NaN.
     void SetGaussian(double dfSigma);
 

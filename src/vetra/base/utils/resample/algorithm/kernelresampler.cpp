@@ -1,10 +1,22 @@
 #include "vetra/base/utils/resample/algorithm/kernelresampler.h"
 
+#include "vetra/base/utils/resample/algorithm/kernelfile.h"
 #include "vetra/base/utils/resample/algorithm/resamplerinfo.h"
 #include "vetra/faultcore/exceptions.h"
 
 namespace vetra::utils {
 namespace {
+
+// What a kernel file holds.
+struct Kernel {
+    explicit Kernel(const std::string& sFile) {
+        LoadKernelFile(sFile, nCols, nRows, nSubPixels, vdfWeights);
+    }
+    int nCols = 0;
+    int nRows = 0;
+    int nSubPixels = 0;
+    std::vector<double> vdfWeights;
+};
 
 void CheckKernel(int nWndNumCols, int nWndNumRows, int nSubPixels,
                  const std::vector<double>& vdfWeights, const char* pszFile,
@@ -28,6 +40,11 @@ ResampleInfo KernelInfo(ResampleMethod eMethod, int nWndNumCols, int nWndNumRows
 }  // namespace
 
 KernelResampler::KernelResampler() = default;
+KernelResampler::KernelResampler(const std::string& sFile) {
+    const Kernel oKernel(sFile);
+    KernelResampler::SetParameters(oKernel.nCols, oKernel.nRows, oKernel.nSubPixels,
+                                   oKernel.vdfWeights);
+}
 KernelResampler::KernelResampler(int nWndNumCols, int nWndNumRows, int nSubPixels,
                                  const std::vector<double>& vdfWeights) {
     KernelResampler::SetParameters(nWndNumCols, nWndNumRows, nSubPixels, vdfWeights);
@@ -46,6 +63,11 @@ void KernelResampler::SetParameters(int nWndNumCols, int nWndNumRows, int nSubPi
 }
 
 SqKernelResampler::SqKernelResampler() = default;
+SqKernelResampler::SqKernelResampler(const std::string& sFile) {
+    const Kernel oKernel(sFile);
+    SqKernelResampler::SetParameters(oKernel.nCols, oKernel.nRows, oKernel.nSubPixels,
+                                     oKernel.vdfWeights);
+}
 SqKernelResampler::SqKernelResampler(int nWndNumCols, int nWndNumRows, int nSubPixels,
                                      const std::vector<double>& vdfWeights) {
     SqKernelResampler::SetParameters(nWndNumCols, nWndNumRows, nSubPixels, vdfWeights);

@@ -1,6 +1,7 @@
 #ifndef VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_KERNELRESAMPLER_H
 #define VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_KERNELRESAMPLER_H
 
+#include <string>
 #include <vector>
 
 #include "vetra/base/utils/resample/irasterresampler.h"
@@ -12,6 +13,11 @@ namespace vetra::utils {
 /// size has one pixel more on the right or lower side.
 class VETRA_EXPORT KernelResampler : public IRasterResampler {
  public:
+    /// Takes size and weights from a kernel file.
+    /// \param sFile  its path
+    /// \throws as `LoadKernelFile`, and as the other constructor for what the file holds.
+    explicit KernelResampler(const std::string& sFile);
+
     /// \param nWndNumCols  window columns C, at least 1
     /// \param nWndNumRows  window rows R, at least 1
     /// \param nSubPixels   number S of sub-pixel steps, at least 0; phase p stands for a position
@@ -28,7 +34,7 @@ class VETRA_EXPORT KernelResampler : public IRasterResampler {
     KernelResampler* Clone() const override;
 
  protected:
-    /// What the constructor does. A refused call leaves the parameters as they were.
+    /// What the second constructor does. A refused call leaves the parameters as they were.
     void SetParameters(int nWndNumCols, int nWndNumRows, int nSubPixels,
                        const std::vector<double>& vdfWeights);
 
@@ -40,6 +46,8 @@ class VETRA_EXPORT KernelResampler : public IRasterResampler {
 class VETRA_EXPORT SqKernelResampler : public IRasterResampler {
  public:
     /// As that of `KernelResampler`.
+    explicit SqKernelResampler(const std::string& sFile);
+    /// As that of `KernelResampler`.
     SqKernelResampler(int nWndNumCols, int nWndNumRows, int nSubPixels,
                       const std::vector<double>& vdfWeights);
     SqKernelResampler(const SqKernelResampler& oOther);
@@ -47,7 +55,7 @@ class VETRA_EXPORT SqKernelResampler : public IRasterResampler {
     SqKernelResampler* Clone() const override;
 
  protected:
-    /// What the constructor does. A refused call leaves the parameters as they were.
+    /// What the second constructor does. A refused call leaves the parameters as they were.
     void SetParameters(int nWndNumCols, int nWndNumRows, int nSubPixels,
                        const std::vector<double>& vdfWeights);
 
