@@ -10,6 +10,7 @@
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 #include "vetra/base/utils/resample/resample.h"
 #include "vetra/base/utils/resample/resamplerfactory.h"
+#include "vetra/textcore/formatstring.h"
 
 namespace vetra::tool {
 
@@ -41,9 +42,9 @@ struct AxisWindow {
 std::vector<double> SampleAxis(ResampleInfo oInfo, Axis eAxis, const AxisWindow& oWindow,
                                const AxisWindow& oOther) {
     // The mean along the line is the same for any size, and large ones cost much.
-    const char* pszOtherSize = eAxis == eAxisCols ? "NUMROWS" : "NUMCOLS";
-    if (oInfo.moCoefficients.count(pszOtherSize) != 0) {
-        oInfo.moCoefficients[pszOtherSize] = "1";
+    const auto oSize = oInfo.moCoefficients.find(eAxis == eAxisCols ? "NUMROWS" : "NUMCOLS");
+    if (oSize != oInfo.moCoefficients.end()) {
+        oSize->second = std::to_string(1);
     }
     const int nTaps = oWindow.nTaps;
     const int nLine = nTaps;
@@ -97,8 +98,8 @@ KernelWeights SampleMethod(const IRasterResampler& oResampler, ResampleMethod eM
     int nLeft, nTop, nRight, nBottom;
     oResampler.GetSrcBufferMargins(nLeft, nTop, nRight, nBottom);
     if (std::max(nRight, nBottom) > kLargestAverage) {
-        throw UsageError("a window of more than " + std::to_string(kLargestAverage) +
-                         " columns or rows is too large for a kernel");
+        throw UsageError(FormatString(
+            "a window of more than %d columns or rows is too large for a kernel", kLargestAverage));
     }
     const AxisWindow oCols(nLeft, nRight);
     const AxisWindow oRows(nTop, nBottom);

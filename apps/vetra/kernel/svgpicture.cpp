@@ -53,12 +53,14 @@ void SvgPicture::AddRectangle(Point oCorner, double dfWidth, double dfHeight,
 
 void SvgPicture::AddLines(const std::vector<Point>& oPoints, const char* pszClass) {
     msText += "<polyline class=\"" + std::string(pszClass) + "\" points=\"";
-    const char* pszGap = "";
     for (const Point& oPoint : oPoints) {
-        msText += pszGap + Number(oPoint.dfX) + "," + Number(oPoint.dfY);
-        pszGap = " ";
+        msText += Number(oPoint.dfX);
+        msText += ',';
+        msText += Number(oPoint.dfY);
+        msText += ' ';
     }
-    msText += "\"/>\n";
+    msText.back() = '"';
+    msText += "/>\n";
 }
 
 void SvgPicture::AddText(Point oPlace, const std::string& sText, const char* pszClass) {

@@ -220,7 +220,7 @@ TEST_F(ToolTest, MethodsAreDrawn) {
          2},
         {"KERNEL,FILE=a<&>\xc3\xa4.txt", {"KERNEL,FILE=a<&>\xc3\xa4.txt"}, 1},
         {"KERNEL,FILE=\xff\x01.txt",
-         {"KERNEL,FILE=??.txt",
+         {"KERNEL,FILE=? .txt",
           "columns: the weights of a phase sum to 1 to 1.2, not to 1: the level changes."},
          2},
     };
