@@ -7,7 +7,7 @@ cd "$(dirname "$0")/.."
 
 vetra=${1:-}
 if [ -z "$vetra" ]; then
-    scripts/install-deps.sh build tool demo
+    scripts/install-deps.sh build tool guide
     cmake --preset release -DVETRA_TESTS=OFF -DVETRA_EXAMPLES=OFF >/dev/null
     cmake --build --preset release --target vetra_tool
     vetra=build/release/apps/vetra/vetra

@@ -68,6 +68,26 @@ AxisRange GetWeightRange(const std::vector<Curve>& oCurves) {
     return MakeRange(dfLow - 0.06 * dfHeight, dfHigh + 0.06 * dfHeight, 8, "weight");
 }
 
+// The parts of a curve that are above a floor, down to it.
+std::vector<std::vector<Point>> CutAtFloor(const std::vector<Point>& oPoints, double dfFloor) {
+    std::vector<std::vector<Point>> oParts;
+    bool bAbove = false;
+    for (std::size_t n = 0; n < oPoints.size(); ++n) {
+        const bool bWasAbove = bAbove;
+        bAbove = oPoints[n].dfY > dfFloor;
+        if (bAbove && !bWasAbove) {
+            oParts.emplace_back();
+            if (n > 0) {
+                oParts.back().push_back({oPoints[n - 1].dfX, dfFloor});
+            }
+        }
+        if (bAbove || bWasAbove) {
+            oParts.back().push_back({oPoints[n].dfX, std::max(oPoints[n].dfY, dfFloor)});
+        }
+    }
+    return oParts;
+}
+
 }  // namespace
 
 void DrawImpulseResponses(SvgPicture& oPicture, const PanelArea& oArea,
@@ -144,9 +164,11 @@ void DrawFrequencyResponses(SvgPicture& oPicture, const PanelArea& oArea,
     for (Curve& oCurve : oCurves) {
         oGains.DrawCurve(oCurve.oPoints, oCurve.pszClass);
         for (Point& oPoint : oCurve.oPoints) {
-            oPoint.dfY = std::max(kLowestDecibels, ToDecibels(oPoint.dfY));
+            oPoint.dfY = ToDecibels(oPoint.dfY);
         }
-        oDecibels.DrawCurve(oCurve.oPoints, oCurve.pszClass);
+        for (const std::vector<Point>& oPart : CutAtFloor(oCurve.oPoints, kLowestDecibels)) {
+            oDecibels.DrawCurve(oPart, oCurve.pszClass);
+        }
     }
 }
 

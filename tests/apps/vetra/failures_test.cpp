@@ -138,7 +138,7 @@ TEST_F(ToolTest, TellsWhatItIsAndDoes) {
     const Outcome oMethods = Run("methods");
     EXPECT_EQ(oMethods.nStatus, 0);
     for (const char* pszText :
-         {"\nSQKERNEL ", "\nCPLXSAR ", "\nLAGRANGE8   8 x 8   -3 -3 4 4 ", "free parameter -1"}) {
+         {"\nSQKERNEL ", "\nCPLXSAR ", "\nLAGRANGE8   8 x 8    -3 -3 4 4\n", "free parameter -1"}) {
         EXPECT_NE(oMethods.sOut.find(pszText), std::string::npos) << pszText;
     }
     EXPECT_EQ(Run("--version").sOut.rfind("vetra ", 0), 0u);
