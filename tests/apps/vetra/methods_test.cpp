@@ -94,8 +94,11 @@ TEST_F(ToolTest, MethodsAreDescribed) {
     const std::string sAll = Run("methods").sOut;
     for (const char* pszName : {"NEAR", "BILIN", "CUBIC", "CUBICPS", "LAGRANGE4", "LAGRANGE8",
                                 "SINC8", "SINC16", "AVERAGE", "MEDIAN", "GAUSSIAN", "KERNEL"}) {
-        EXPECT_NE(std::string::npos, sAll.find(std::string("\n") + pszName + " ")) << pszName;
-        EXPECT_NE(std::string::npos, sAll.find(std::string("\nSQ") + pszName + " ")) << pszName;
+        for (const char* pszBefore : {"\n", "\nSQ"}) {
+            std::string sLine = pszBefore;
+            sLine.append(pszName).append(" ");
+            EXPECT_NE(std::string::npos, sAll.find(sLine)) << sLine;
+        }
     }
     EXPECT_NE(std::string::npos, sAll.find("\nCPLXSAR "));
     EXPECT_EQ(

@@ -101,10 +101,13 @@ TEST(FileUtils, Permissions) {
     fs::create_directory(oScratch.Path("closed"));
     oScratch.Write("closed/x", "");
     chmod(oScratch.Path("closed").c_str(), 0);
+    const std::string sLink = oScratch.Path("to_nothing");
+    fs::create_symlink("nowhere", sLink);
     chmod(oScratch.GetPath().c_str(), 0555);
     EXPECT_TRUE(AsOrdinaryUser([&] { return CanRead(sReadable) && !CanWrite(sReadable); }));
     EXPECT_TRUE(AsOrdinaryUser([&] { return !CanRead(sWritable) && CanWrite(sWritable); }));
-    EXPECT_TRUE(AsOrdinaryUser([&] { return IsRefusedToDelete(sReadable); }));
+    EXPECT_TRUE(
+        AsOrdinaryUser([&] { return IsRefusedToDelete(sReadable) && IsRefusedToDelete(sLink); }));
     EXPECT_TRUE(AsOrdinaryUser([&] {
         const std::string sRoot = oScratch.GetPath();
         return Sorted(FindFiles(sRoot, "able", true)) == Paths{sReadable, sWritable} &&
@@ -152,7 +155,7 @@ TEST(FileUtils, RemoveFile) {
     EXPECT_FALSE(IsFile(sFile));
 }
 
-// The two orders as stated, call within call.
+// The two orders, call within call.
 Paths PlainFind(const std::string& sFolder, const std::string& sSuffix) {
     Paths vsFound;
     for (const fs::directory_entry& oEntry : fs::directory_iterator(sFolder)) {

@@ -3,6 +3,7 @@
 #include <gtest/gtest.h>
 #include <sys/stat.h>
 
+#include <algorithm>
 #include <climits>
 #include <cmath>
 #include <cstdlib>
@@ -192,7 +193,7 @@ TEST(KernelFile, FormsThatAreRead) {
     for (const char* psz : {"2,1\n1,2\n3,4\n", "2,1\r\n1,2\r\n\r\n3,4\r\n", "2,1\n1,2,3,4",
                             ",2,,1,\n,1,,2,\n,\n3\n4,\n", "2,1\n\n#x\n \t\n1,2,3,\n#1\n4\n# end",
                             "2,1\n \t1 , 2 \n3,4 , \n , \n", " 2x,+1.9\n1.,+2\n0.03E2,400e-2\n",
-                            "2,1\n1D2,2d-5,3.D+1,4\n"}) {
+                            "2,1\n10D-1,.2d+1,3.D0,4\n"}) {
         EXPECT_EQ(LoadText(psz), oShort) << psz;
     }
     EXPECT_EQ(LoadText("2,1,0\n1\n2\n3\n"), (Loaded{2, 1, 0, {1, 2, 3}, ""}));
@@ -293,7 +294,7 @@ TEST(KernelFile, LongLinesAndRubbish) {
     }
 }
 
-// The rules as stated, line by line.
+// The rules, line by line.
 Loaded PlainLoad(const std::string& sText) {
     Loaded o;
     std::istringstream oStream(sText);
@@ -312,12 +313,13 @@ Loaded PlainLoad(const std::string& sText) {
             continue;
         }
         sLine = TrimWhitespace(sLine);
-        for (const std::string& sField : TokenizeString(sLine, ",", true, true)) {
+        for (std::string sField : TokenizeString(sLine, ",", true, true)) {
             if (!IsNumeric(sField)) {
                 o.sFailure = "format: " + sLine + '|' + kBadLine;
                 return o;
             }
             if (nCount++ < nTotal) {
+                std::replace(sField.begin(), sField.end(), 'D', 'E');
                 o.vdfWeights.push_back(std::atof(sField.c_str()));
             }
         }

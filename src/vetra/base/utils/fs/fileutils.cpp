@@ -165,7 +165,7 @@ std::vector<std::string> FindFiles(const std::string& directory, const std::stri
     if (suffix.empty()) {
         return vsFound;
     }
-    // The stated order is that of the walk backwards, each directory's own files forwards.
+    // The order is that of the walk backwards, each directory's own files forwards.
     Walk(directory + '/', recurse,
          [&](const std::string& sPrefix, const std::vector<std::string>& vsFiles) {
              for (auto it = vsFiles.rbegin(); it != vsFiles.rend(); ++it) {

@@ -174,7 +174,8 @@ void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
     nRows = bSingleKernel ? 0 : HeaderNumber(vsHeader[1]);
     nSubPixels = HeaderNumber(vsHeader.back());
     const std::int64_t nTotal = NumWeights(nCols, nRows, nSubPixels);
-    if (nTotal < 0 || static_cast<std::uint64_t>(nTotal) > vdfWeights.max_size()) {
+    // A negative number becomes a large one.
+    if (static_cast<std::uint64_t>(nTotal) > vdfWeights.max_size()) {
         throw std::length_error("vector<T> too long");
     }
 
@@ -184,7 +185,7 @@ void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
     for (; eField == KernelText::Field::eNumber; eField = oText.ReadField(sField)) {
         // What is too much is read to its end, for a later failure, and not kept.
         if (nCount < nTotal) {
-            vdfWeights.push_back(TextToDouble(sField.substr(0, sField.find_first_of("Dd"))));
+            vdfWeights.push_back(TextToDouble(sField));
         }
         ++nCount;
     }

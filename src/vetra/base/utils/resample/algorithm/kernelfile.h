@@ -24,9 +24,8 @@
 /// must be right.
 ///
 /// A header field that is no integer counts as 0, one beyond the range of int as the nearest int.
-/// A weight may have an exponent of E, e, D or d (`IsNumeric`) and is read like `atof`, which stops
-/// at a D or d: "1D2" is 1. Memory grows with the weights in the file and not with what the header
-/// promises.
+/// A weight may have an exponent of E, e, D or d (`IsNumeric`) and is read whole (`TextToDouble`).
+/// Memory grows with the weights in the file and not with what the header promises.
 ///
 /// \param sFile       the file's path
 /// \param nCols       taps of a column kernel
