@@ -100,7 +100,10 @@ TEST_F(ToolTest, MethodsAreDescribed) {
             EXPECT_NE(std::string::npos, sAll.find(sLine)) << sLine;
         }
     }
-    EXPECT_NE(std::string::npos, sAll.find("\nCPLXSAR "));
+    for (const char* pszText : {"\nCPLXSAR ", "\nLAGRANGE8   8 x 8    -3 -3 4 4\n",
+                                "NUMCOLS=C NUMROWS=R", "free parameter -1"}) {
+        EXPECT_NE(std::string::npos, sAll.find(pszText)) << pszText;
+    }
     EXPECT_EQ(
         "method: GAUSSIAN\nNUMCOLS: 6\nNUMROWS: 2\nSIGMACOL: 0.866025\nSIGMAROW: 0.229129\n"
         "window: 6 x 2\nmargins: -2 0 3 1\n",
