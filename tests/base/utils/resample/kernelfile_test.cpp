@@ -8,12 +8,14 @@
 #include <cmath>
 #include <cstdlib>
 #include <filesystem>
+#include <iomanip>
 #include <iterator>
 #include <random>
 #include <sstream>
 #include <stdexcept>
 #include <string>
 #include <typeinfo>
+#include <utility>
 #include <vector>
 
 #include "tests/support/scratchfolder.h"
@@ -144,6 +146,16 @@ TEST(KernelFile, FormAsWritten) {
               "2.00000000000000e+00\n");
     SaveKernelFile(sFile, 2, INT_MIN, 0, vdfWeights, true);
     EXPECT_EQ(oScratch.Read("kernel"), "2,0\n2.50000000000000e-01,-3.33333333333333e-01\n");
+
+    // A stream gets the same text, whatever its own format.
+    std::ostringstream oText;
+    oText << std::hex << std::fixed << std::setw(40);
+    SaveKernelFile(oText, 2, 1, 1, std::as_const(vdfWeights), true);
+    EXPECT_EQ(oText.str(),
+              "2,1\n2.50000000000000e-01,-3.33333333333333e-01\n"
+              "1.00000000000000e-300,-0.00000000000000e+00\n");
+    EXPECT_EQ(FailureOf([&] { SaveKernelFile(oText, 8, 0, 0, vdfWeights, true); }),
+              "data: Kernel buffer has incorrect number of weights.|located");
 
     // Refused before the file is touched.
     const std::string sBefore = oScratch.Read("kernel");

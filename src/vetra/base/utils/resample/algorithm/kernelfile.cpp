@@ -5,15 +5,15 @@
 #include <cstdlib>
 #include <filesystem>
 #include <fstream>
-#include <iomanip>
 #include <limits>
-#include <locale>
+#include <ostream>
 #include <stdexcept>
 #include <system_error>
 
 #include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/string/stringutils.h"
 #include "vetra/faultcore/exceptions.h"
+#include "vetra/textcore/formatstring.h"
 
 namespace {
 
@@ -134,6 +134,16 @@ std::int64_t NumWeights(int nCols, int nRows, int nSubPixels) {
     return (std::int64_t{nCols} + nRows) * (std::int64_t{nSubPixels} + 1);
 }
 
+// Refuses to write what a table doesn't hold.
+void CheckBuffer(int nCols, int nRowTaps, int nSubPixels, const std::vector<double>& vdfWeights,
+                 const char* pszFile, const char* pszFunction, std::uint32_t nLine) {
+    if (nCols < 1 || nRowTaps < 0 || nSubPixels < 0 ||
+        static_cast<std::uint64_t>(NumWeights(nCols, nRowTaps, nSubPixels)) > vdfWeights.size()) {
+        throw vetra::DataException("Kernel buffer has incorrect number of weights.", pszFile,
+                                   pszFunction, nLine);
+    }
+}
+
 }  // namespace
 
 void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
@@ -199,30 +209,36 @@ void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int& nSubPixels,
 
 void SaveKernelFile(std::string sFile, int nCols, int nRows, int nSubPixels,
                     std::vector<double>& vdfWeights, bool bSingleKernel) {
-    const int nRowTaps = bSingleKernel ? 0 : nRows;
-    if (nCols < 1 || nRowTaps < 0 || nSubPixels < 0 ||
-        static_cast<std::uint64_t>(NumWeights(nCols, nRowTaps, nSubPixels)) > vdfWeights.size()) {
-        throw vetra::DataException("Kernel buffer has incorrect number of weights.", VETRA_HERE);
-    }
+    CheckBuffer(nCols, bSingleKernel ? 0 : nRows, nSubPixels, vdfWeights, VETRA_HERE);
     // The C library would open the path up to a zero byte, another file.
     if (sFile.find('\0') != std::string::npos) {
         return;
     }
     std::ofstream oStream(sFile);
-    oStream.imbue(std::locale::classic());
-    oStream << std::scientific << std::setprecision(14) << nCols << ',';
+    SaveKernelFile(oStream, nCols, nRows, nSubPixels, vdfWeights, bSingleKernel);
+}
+
+void SaveKernelFile(std::ostream& oStream, int nCols, int nRows, int nSubPixels,
+                    const std::vector<double>& vdfWeights, bool bSingleKernel) {
+    const int nRowTaps = bSingleKernel ? 0 : nRows;
+    CheckBuffer(nCols, nRowTaps, nSubPixels, vdfWeights, VETRA_HERE);
+    std::string sLine = FormatString("%d,", nCols);
     if (!bSingleKernel) {
-        oStream << nRowTaps << ',';
+        sLine += FormatString("%d,", nRowTaps);
     }
-    oStream << nSubPixels << '\n';
+    sLine += FormatString("%d\n", nSubPixels);
+    // Without the stream's formatting.
+    oStream.write(sLine.data(), static_cast<std::streamsize>(sLine.size()));
     std::size_t nNext = 0;
     for (const int nTaps :
          bSingleKernel ? std::vector<int>{nCols} : std::vector<int>{nCols, nRowTaps}) {
         for (std::int64_t nPhase = 0; nPhase <= nSubPixels; ++nPhase) {
+            sLine.clear();
             for (int nTap = 0; nTap < nTaps; ++nTap) {
-                oStream << (nTap > 0 ? "," : "") << vdfWeights[nNext++];
+                sLine += FormatString(nTap > 0 ? ",%.14e" : "%.14e", vdfWeights[nNext++]);
             }
-            oStream << '\n';
+            sLine += '\n';
+            oStream.write(sLine.data(), static_cast<std::streamsize>(sLine.size()));
         }
     }
 }

@@ -1,6 +1,7 @@
 #ifndef VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_KERNELFILE_H
 #define VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_KERNELFILE_H
 
+#include <iosfwd>
 #include <string>
 #include <vector>
 
@@ -55,5 +56,10 @@ VETRA_EXPORT void LoadKernelFile(std::string sFile, int& nCols, int& nRows, int&
 ///         touched.
 VETRA_EXPORT void SaveKernelFile(std::string sFile, int nCols, int nRows, int nSubPixels,
                                  std::vector<double>& vdfWeights, bool bSingleKernel);
+
+/// As above, into a stream, whose own number format and locale don't count. A failure to write
+/// shows in the stream's state.
+VETRA_EXPORT void SaveKernelFile(std::ostream& oStream, int nCols, int nRows, int nSubPixels,
+                                 const std::vector<double>& vdfWeights, bool bSingleKernel);
 
 #endif  // VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_KERNELFILE_H
