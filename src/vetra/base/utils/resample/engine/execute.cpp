@@ -514,7 +514,7 @@ void Execute(const Task& oTask) {
             padfScratch.reset(new double[nScratch]);
         }
     }
-#pragma omp parallel num_threads(nMaxThreads)
+#pragma omp parallel
     {
         const int nThread = omp_get_thread_num();
         const long long nThreads = omp_get_num_threads();
