@@ -77,7 +77,8 @@ void AddKernelCommand(CLI::App& oApp) {
         "on square roots: use them with SQKERNEL. MEDIAN has none; those of CPLXSAR are complex\n"
         "and can only be drawn.\n"
         "AVERAGE is written as the method places its window: from the nearest pixel on, to the\n"
-        "right and down. vetra resample moves AVERAGE to lie around the position, but not a kernel.");
+        "right and down. vetra resample moves AVERAGE to lie around the position, but not a "
+        "kernel.");
     poCommand->callback([poOptions] { RunKernel(*poOptions); });
 }
 
