@@ -19,11 +19,14 @@ geoid=/usr/share/proj/egm96_15.gtx
 echo "== the earth at half its size"
 "$vetra" resample "$earth" "$out/earth_half.png" --scale 0.5 --method BILIN
 
-echo "== a detail of it, eight times as large: nearest, bilinear, cubic"
+echo "== each pixel the mean of 16 x 16"
+"$vetra" resample "$earth" "$out/earth_small.png" --downsample 16
+
+echo "== a detail of it, eight times as large: nearest, bilinear, cubic, windowed sinc"
 read -r cols rows < <(gdalinfo "$earth" | sed -n 's/^Size is \([0-9]*\), \([0-9]*\)/\1 \2/p')
 gdal_translate -q -of VRT -srcwin $((cols / 2)) $((rows / 4)) $((cols / 16)) $((rows / 8)) \
     "$earth" "$out/detail.vrt"
-for method in NEAR BILIN CUBIC; do
+for method in NEAR BILIN CUBIC SINC8; do
     "$vetra" resample "$out/detail.vrt" "$out/detail_${method,,}.png" --scale 8 --method "$method"
 done
 rm "$out/detail.vrt"

@@ -1,5 +1,6 @@
 #!/usr/bin/env bash
-# Installs the Debian packages of the named groups that are missing: build, tool, tests, demo, bench.
+# Installs the Debian packages of the named groups that are missing: build, tool, tests, demo, guide,
+# bench.
 set -euo pipefail
 
 declare -A groups=(
@@ -7,6 +8,7 @@ declare -A groups=(
     [tool]="libgdal-dev libcli11-dev"
     [tests]="clang libclang-rt-dev libomp-dev libgtest-dev pkg-config"
     [demo]="gdal-bin proj-data xplanet-images"
+    [guide]="gdal-bin"
     [bench]="libbenchmark-dev libopencv-dev"
 )
 

@@ -7,6 +7,7 @@
 #include <vector>
 
 #include "gdalraster/errors.h"
+#include "kernelcommand.h"
 #include "methodscommand.h"
 #include "rasterjob/interrupt.h"
 #include "resamplecommand.h"
@@ -51,6 +52,7 @@ int Run(int nArgs, char** papszArgs) {
     oApp.require_subcommand(1);
     AddResampleCommand(oApp);
     AddMethodsCommand(oApp);
+    AddKernelCommand(oApp);
     try {
         oApp.parse(CompletePairs(nArgs, papszArgs));
     } catch (const CLI::Success& oHelp) {

@@ -1,5 +1,7 @@
 #include "methods.h"
 
+#include <cstring>
+
 #include "gdalraster/errors.h"
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 #include "vetra/base/utils/resample/resample.h"
@@ -102,8 +104,14 @@ std::unique_ptr<IRasterResampler> MakeResampler(const std::string& sMethod) {
 }
 
 bool IsNearest(const IRasterResampler& oResampler) {
-    const ResampleMethod eMethod = oResampler.GetResampleType();
-    return eMethod == eRM_NEAR || eMethod == eRM_SQNEAR;
+    return GetPlainTwin(oResampler.GetResampleType()) == eRM_NEAR;
+}
+
+ResampleMethod GetPlainTwin(ResampleMethod eMethod) {
+    const std::string sName = ResamplerFactory::MethodToName(eMethod);
+    return sName.starts_with(kSquaredPrefix)
+               ? ResamplerFactory::NameToMethod(sName.substr(std::strlen(kSquaredPrefix)))
+               : eMethod;
 }
 
 void RunOnePixel(const utils::ResampleInfo& oInfo, gobs::NativeDataTypeCode eSrcType,

@@ -15,6 +15,9 @@ std::unique_ptr<utils::IRasterResampler> MakeResampler(const std::string& sMetho
 /// Whether a method gives samples of the source as they are.
 bool IsNearest(const utils::IRasterResampler& oResampler);
 
+/// The method whose mathematics a squared one runs on square roots; any other method itself.
+ResampleMethod GetPlainTwin(ResampleMethod eMethod);
+
 /// Resamples one pixel between these types, to see whether the engine can do it.
 /// \throws what `utils::Resample` throws.
 void RunOnePixel(const utils::ResampleInfo& oInfo, gobs::NativeDataTypeCode eSrcType,

@@ -37,8 +37,11 @@ if(SHARED_LIBRARY)
     # Mangled names: the namespace vetra without its private part, the global functions and
     # classes, and weak instances of the standard library's templates.
     set(functions "FormatString|ChooseResampleMode|ChooseResampleModeForFilter")
+    string(APPEND functions "|GetShapingWindow|GenerateGaussianKernel")
     string(APPEND functions "|TrimWhitespace|IsNumeric|TextToDouble|CollapseWhitespace|ToLower|ToUpper|Strip")
     string(APPEND functions "|CountChar|FindAndReplace|HashString|NumDigits|TokenizeString")
+    string(APPEND functions "|IsFile|IsDirectory|CanRead|CanWrite|GetExtension|GetName|RemoveFile")
+    string(APPEND functions "|FindFiles|FindFilesByWildcard|LoadKernelFile|SaveKernelFile")
     set(classes "22CaseInsensitiveCompare|10ITokenizer|15StringTokenizer")
     set(public "[A-Z] _Z(T[VIS])?NK?5vetra|T _Z[0-9]+(${functions})[a-zA-Z]")
     string(APPEND public "|[A-Z] _Z(T[VIS])?(NK?)?(${classes})")

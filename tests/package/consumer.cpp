@@ -2,6 +2,7 @@
 
 #include <cstdio>
 #include <memory>
+#include <vector>
 
 using namespace vetra::utils;
 
@@ -51,18 +52,40 @@ int main() {
     float afPos[] = {0.0f};
     const BufPosArrayTfm oArray(1, 1, afPos, 0, afPos, 0, false);
     const BufPosBilinearTfm oBilinear(1, 1, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0);
+    const ShapingWindow oWindow = GetShapingWindow(ResampleInfo());
     const std::unique_ptr<IRasterResampler> apoResamplers[] = {
-        std::make_unique<BilinearResampler>(),    std::make_unique<SqBilinearResampler>(),
-        std::make_unique<CubicResampler>(),       std::make_unique<SqCubicResampler>(),
-        std::make_unique<CubicPsResampler>(),     std::make_unique<SqCubicPsResampler>(),
-        std::make_unique<Lagrange4Resampler>(),   std::make_unique<SqLagrange4Resampler>(),
-        std::make_unique<Lagrange8Resampler>(),   std::make_unique<SqLagrange8Resampler>(),
-        std::make_unique<AverageResampler>(1, 1), std::make_unique<SqAverageResampler>(1, 1),
-        std::make_unique<MedianResampler>(1, 1),  std::make_unique<SqMedianResampler>(1, 1),
-        std::make_unique<SqNearestResampler>(),   std::make_unique<CplxSarResampler>(1, 1, 0.0)};
+        std::make_unique<BilinearResampler>(),
+        std::make_unique<SqBilinearResampler>(),
+        std::make_unique<CubicResampler>(),
+        std::make_unique<SqCubicResampler>(),
+        std::make_unique<CubicPsResampler>(),
+        std::make_unique<SqCubicPsResampler>(),
+        std::make_unique<Lagrange4Resampler>(),
+        std::make_unique<SqLagrange4Resampler>(),
+        std::make_unique<Lagrange8Resampler>(),
+        std::make_unique<SqLagrange8Resampler>(),
+        std::make_unique<AverageResampler>(1, 1),
+        std::make_unique<SqAverageResampler>(1, 1),
+        std::make_unique<MedianResampler>(1, 1),
+        std::make_unique<SqMedianResampler>(1, 1),
+        std::make_unique<SqNearestResampler>(),
+        std::make_unique<CplxSarResampler>(1, 1, 0.0),
+        std::make_unique<Sinc8Resampler>(oWindow),
+        std::make_unique<SqSinc8Resampler>(oWindow),
+        std::make_unique<Sinc16Resampler>(oWindow),
+        std::make_unique<SqSinc16Resampler>(oWindow),
+        std::make_unique<GaussianResampler>(1.0f, 1.0f),
+        std::make_unique<SqGaussianResampler>(1.0f, 1.0f),
+        std::make_unique<KernelResampler>(1, 1, 0, std::vector<double>(2, 1.0)),
+        std::make_unique<SqKernelResampler>(1, 1, 0, std::vector<double>(2, 1.0))};
     for (const auto& poResampler : apoResamplers) {
         Check(BlockPlanner(oArray, 3, 1, *poResampler, 1, 1).GetNumBlocks() == 1, "blocks");
     }
+    const std::unique_ptr<IRasterResampler> poMade(ResamplerFactory().GetResampler("8pt,min=0"));
+    Check(poMade->GetResampleType() == ResamplerFactory::NameToMethod("SINC8"), "factory");
+    std::vector<double> vdfWeights;
+    GenerateGaussianKernel(1, 2, 1.0f, 1.0f, vdfWeights);
+    Check(vdfWeights.size() == 65 * 3, "Gaussian kernels");
     double *padfAcross, *padfReal, *padfImag;
     GetCplxSarCoeffs(1, 1, 0.0, 1, padfAcross, padfReal, padfImag);
     Check(padfAcross[0] == 1.0 && padfReal[0] == 1.0 && padfImag[0] == 0.0, "complex SAR taps");
@@ -78,6 +101,13 @@ int main() {
           "modes");
     Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
     Check(StringTokenizer("a b").CountTokens() == 2 && HashString("") == 1339080641, "tokens");
+    SaveKernelFile("kernel.txt", 1, 1, 0, vdfWeights, false);
+    int nKernelCols = 0, nKernelRows = 0, nSubPixels = 7;
+    LoadKernelFile("kernel.txt", nKernelCols, nKernelRows, nSubPixels, vdfWeights);
+    Check(nKernelCols == 1 && nKernelRows == 1 && nSubPixels == 0, "kernel file");
+    Check(FindFilesByWildcard("", "kernel.tx?", false).size() == 1, "found files");
+    RemoveFile("kernel.txt");
+    Check(!IsFile("kernel.txt"), "removed file");
     Check(FormatString("%d.%d.%d", VETRA_VERSION_MAJOR, VETRA_VERSION_MINOR, VETRA_VERSION_PATCH) ==
               VETRA_VERSION,
           "version");

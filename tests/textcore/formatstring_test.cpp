@@ -2,7 +2,9 @@
 
 #include <gtest/gtest.h>
 
+#include <clocale>
 #include <limits>
+#include <string>
 
 namespace {
 
@@ -22,6 +24,17 @@ TEST(FormatString, AnyLength) {
         EXPECT_EQ(FormatString("%s|%d", sLong.c_str(), 7), sLong + "|7");
     }
     EXPECT_EQ(FormatString("%f", std::numeric_limits<double>::max()).size(), 309u + 7u);
+}
+
+TEST(FormatString, DecimalPointInEveryLocale) {
+    const std::string sOld = std::setlocale(LC_ALL, nullptr);
+    if (std::setlocale(LC_ALL, "de_DE.UTF-8") == nullptr &&
+        std::setlocale(LC_ALL, "fr_FR.UTF-8") == nullptr) {
+        GTEST_SKIP() << "no locale with a decimal comma is installed";
+    }
+    EXPECT_EQ(FormatString("%f %24.16e", 0.5, 0.25), "0.500000   2.5000000000000000e-01");
+    EXPECT_STREQ(std::localeconv()->decimal_point, ",");  // the caller's locale is back
+    std::setlocale(LC_ALL, sOld.c_str());
 }
 
 }  // namespace

@@ -221,7 +221,7 @@ class BlockRun {
     const unsigned char* FillApart(const utils::ResampleBuffer& oSrc, int nGroup,
                                    utils::ResampleInfo oInfo, const utils::ResampleBlock& oBlock) {
         const auto nNumPix = static_cast<std::size_t>(oBlock.oTarget.GetNumPix());
-        oInfo.meMethod = oInfo.meMethod >= eRM_SQBILIN ? eRM_SQNEAR : eRM_NEAR;
+        oInfo.meMethod = GetPlainTwin(oInfo.meMethod) == oInfo.meMethod ? eRM_NEAR : eRM_SQNEAR;
         unsigned char* pabyRequest = moOutcome.Get();
         std::replace_if(
             pabyRequest, pabyRequest + nNumPix,

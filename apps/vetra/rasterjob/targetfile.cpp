@@ -3,9 +3,9 @@
 #include <stdlib.h>
 
 #include <cerrno>
+#include <fstream>
 #include <system_error>
 #include <utility>
-#include <vector>
 
 #include "gdalraster/errors.h"
 
@@ -38,7 +38,7 @@ std::vector<fs::path> GetSideFileNames(const fs::path& oPath) {
 
 }  // namespace
 
-fs::path ResolveTarget(const std::string& sPath, SourceRaster& oSource) {
+fs::path ResolveTarget(const std::string& sPath) {
     if (sPath.starts_with("/vsi")) {
         throw RunError("the target " + sPath + " is not in the file system");
     }
@@ -50,6 +50,11 @@ fs::path ResolveTarget(const std::string& sPath, SourceRaster& oSource) {
     if (!oPath.has_filename() || (fs::exists(oPath, oError) && !fs::is_regular_file(oPath))) {
         throw RunError("the target " + sPath + " is not a file");
     }
+    return oPath;
+}
+
+fs::path ResolveTarget(const std::string& sPath, SourceRaster& oSource) {
+    fs::path oPath = ResolveTarget(sPath);
     if (oSource.Owns(oPath)) {
         throw RunError("the target " + sPath + " is a file of the source");
     }
@@ -76,7 +81,17 @@ TargetFile::~TargetFile() {
     fs::remove_all(moFolder, oError);
 }
 
-void TargetFile::Commit(SourceRaster& oSource) {
+std::vector<std::string> TargetFile::GetSideFiles() const {
+    std::vector<std::string> oNames;
+    for (const fs::directory_entry& oEntry : fs::directory_iterator(moFolder)) {
+        if (oEntry.is_regular_file() && oEntry.path() != GetPath()) {
+            oNames.push_back(oEntry.path().filename());
+        }
+    }
+    return oNames;
+}
+
+void TargetFile::Commit() {
     std::error_code oError;
     fs::remove_all(moStage, oError);
     if (!fs::exists(GetPath(), oError)) {
@@ -89,23 +104,35 @@ void TargetFile::Commit(SourceRaster& oSource) {
             ThrowWith("can't write " + oTo.string(), oError);
         }
     };
-    std::vector<fs::path> oStale = GetSideFileNames(moPath);
-    std::vector<fs::path> oSideFiles;
-    for (const fs::directory_entry& oEntry : fs::directory_iterator(moFolder)) {
-        if (oEntry.path() != GetPath()) {
-            oSideFiles.push_back(oEntry.path());
-            std::erase(oStale, moPath.parent_path() / oEntry.path().filename());
-        }
-    }
-    for (const fs::path& oSideFile : oSideFiles) {
-        Move(oSideFile);
+    for (const std::string& sName : GetSideFiles()) {
+        Move(moFolder / sName);
     }
     Move(GetPath());
+}
+
+void TargetFile::Commit(SourceRaster& oSource) {
+    std::vector<fs::path> oStale = GetSideFileNames(moPath);
+    for (const std::string& sName : GetSideFiles()) {
+        std::erase(oStale, moPath.parent_path() / sName);
+    }
+    Commit();
+    std::error_code oError;
     for (const fs::path& oPath : oStale) {
         if (!oSource.Owns(oPath)) {
             fs::remove(oPath, oError);
         }
     }
+}
+
+void WriteTextFile(const fs::path& oPath, const std::string& sText) {
+    TargetFile oTarget(oPath);
+    std::ofstream oFile(oTarget.GetPath(), std::ios::binary);
+    oFile << sText;
+    oFile.close();
+    if (!oFile) {
+        throw RunError("can't write " + oPath.string());
+    }
+    oTarget.Commit();
 }
 
 }  // namespace vetra::tool

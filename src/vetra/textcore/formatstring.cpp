@@ -1,5 +1,7 @@
 #include "vetra/textcore/formatstring.h"
 
+#include <locale.h>
+
 #include <cstdarg>
 #include <cstdio>
 #include <stdexcept>
@@ -12,6 +14,21 @@ struct ArgumentList {
     ~ArgumentList() { va_end(args); }
 };
 
+// The C locale for this thread and the life of the object.
+class NeutralLocale {
+ public:
+    NeutralLocale() : mOld(uselocale(Get())) {}
+    NeutralLocale(const NeutralLocale&) = delete;
+    ~NeutralLocale() { uselocale(mOld); }
+
+ private:
+    static locale_t Get() {
+        static const locale_t kCLocale = newlocale(LC_ALL_MASK, "C", nullptr);
+        return kCLocale;
+    }
+    locale_t mOld;
+};
+
 }  // namespace
 
 std::string FormatString(const char* format, ...) {
@@ -20,6 +37,7 @@ std::string FormatString(const char* format, ...) {
     va_start(oMeasure.args, format);
     va_copy(oWrite.args, oMeasure.args);
 
+    const NeutralLocale oNeutral;
     const int nLength = std::vsnprintf(nullptr, 0, format, oMeasure.args);
     if (nLength < 0) {
         throw std::invalid_argument("FormatString: the arguments cannot be formatted");

@@ -94,10 +94,16 @@ TEST_F(ToolTest, MethodsAreDescribed) {
     const std::string sAll = Run("methods").sOut;
     for (const char* pszName : {"NEAR", "BILIN", "CUBIC", "CUBICPS", "LAGRANGE4", "LAGRANGE8",
                                 "SINC8", "SINC16", "AVERAGE", "MEDIAN", "GAUSSIAN", "KERNEL"}) {
-        EXPECT_NE(std::string::npos, sAll.find("\n" + std::string(pszName) + " ")) << pszName;
-        EXPECT_NE(std::string::npos, sAll.find("\nSQ" + std::string(pszName) + " ")) << pszName;
+        for (const char* pszBefore : {"\n", "\nSQ"}) {
+            std::string sLine = pszBefore;
+            sLine.append(pszName).append(" ");
+            EXPECT_NE(std::string::npos, sAll.find(sLine)) << sLine;
+        }
     }
-    EXPECT_NE(std::string::npos, sAll.find("\nCPLXSAR "));
+    for (const char* pszText : {"\nCPLXSAR ", "\nLAGRANGE8   8 x 8    -3 -3 4 4\n",
+                                "NUMCOLS=C NUMROWS=R", "free parameter -1"}) {
+        EXPECT_NE(std::string::npos, sAll.find(pszText)) << pszText;
+    }
     EXPECT_EQ(
         "method: GAUSSIAN\nNUMCOLS: 6\nNUMROWS: 2\nSIGMACOL: 0.866025\nSIGMAROW: 0.229129\n"
         "window: 6 x 2\nmargins: -2 0 3 1\n",

@@ -4,6 +4,7 @@
 #include <stdlib.h>
 #include <sys/wait.h>
 
+#include <filesystem>
 #include <fstream>
 #include <sstream>
 
@@ -19,19 +20,16 @@ std::string ReadText(const fs::path& oPath) {
 
 }  // namespace
 
-ToolTest::ToolTest() {
-    GDALAllRegister();
-    std::string sFolder = fs::temp_directory_path() / "vetra-tool-XXXXXX";
-    moFolder = mkdtemp(sFolder.data());
-}
+ToolTest::ToolTest() { GDALAllRegister(); }
 
-ToolTest::~ToolTest() { fs::remove_all(moFolder); }
+ToolTest::~ToolTest() = default;
 
 ToolTest::Outcome ToolTest::Run(const std::string& sArgs, const std::string& sBefore) {
-    const std::string sOutputs = moFolder.string() + ".output";
+    const std::string sOutputs = moFolder.GetPath().string() + ".output";
     fs::create_directory(sOutputs);
-    const std::string sCommand = "cd " + moFolder.string() + "; " + sBefore + " " VETRA_TOOL " " +
-                                 sArgs + " >" + sOutputs + "/out 2>" + sOutputs + "/err";
+    const std::string sCommand = "cd " + moFolder.GetPath().string() + "; " + sBefore +
+                                 " " VETRA_TOOL " " + sArgs + " >" + sOutputs + "/out 2>" +
+                                 sOutputs + "/err";
     const int nStatus = std::system(sCommand.c_str());
     const Outcome oOutcome{WIFEXITED(nStatus) ? WEXITSTATUS(nStatus) : 128 + WTERMSIG(nStatus),
                            ReadText(sOutputs + "/out"), ReadText(sOutputs + "/err")};
@@ -47,7 +45,7 @@ void ToolTest::Succeed(const std::string& sArgs) {
 
 std::set<std::string> ToolTest::List() const {
     std::set<std::string> oNames;
-    for (const fs::directory_entry& oEntry : fs::directory_iterator(moFolder)) {
+    for (const fs::directory_entry& oEntry : fs::directory_iterator(moFolder.GetPath())) {
         oNames.insert(oEntry.path().filename());
     }
     return oNames;

@@ -4,11 +4,12 @@
 #include <gdal_priv.h>
 #include <gtest/gtest.h>
 
-#include <filesystem>
 #include <functional>
 #include <set>
 #include <string>
 #include <vector>
+
+#include "tests/support/scratchfolder.h"
 
 /// Runs the built tool in a folder of its own.
 class ToolTest : public ::testing::Test {
@@ -29,7 +30,7 @@ class ToolTest : public ::testing::Test {
     Outcome Run(const std::string& sArgs, const std::string& sBefore = "");
     /// Runs and expects success without a word on the error output.
     void Succeed(const std::string& sArgs);
-    std::string Path(const std::string& sName) const { return moFolder / sName; }
+    std::string Path(const std::string& sName) const { return moFolder.Path(sName); }
     /// The names in the folder, hidden ones too.
     std::set<std::string> List() const;
 
@@ -45,7 +46,7 @@ class ToolTest : public ::testing::Test {
     std::string ReadBytes(const std::string& sName) const;
 
  private:
-    std::filesystem::path moFolder;
+    vetra::tests::ScratchFolder moFolder;
 };
 
 #endif  // VETRA_TESTS_APPS_TOOLTEST_H

@@ -1,7 +1,6 @@
 #include <gtest/gtest.h>
 
 #include <cmath>
-#include <memory>
 #include <new>
 #include <tuple>
 
@@ -17,14 +16,18 @@ constexpr double kPi = 3.141592653589793;
 
 struct Tables {
     Tables(int nWndNumCols, int nWndNumRows, double dfFc, int nNumPhases) {
-        double *padfAcross, *padfReal, *padfImag;
         GetCplxSarCoeffs(nWndNumCols, nWndNumRows, dfFc, nNumPhases, padfAcross, padfReal,
                          padfImag);
-        oAcross.reset(padfAcross);
-        oReal.reset(padfReal);
-        oImag.reset(padfImag);
     }
-    std::unique_ptr<double[]> oAcross, oReal, oImag;
+    Tables(const Tables&) = delete;
+    ~Tables() {
+        delete[] padfAcross;
+        delete[] padfReal;
+        delete[] padfImag;
+    }
+    double* padfAcross = nullptr;
+    double* padfReal = nullptr;
+    double* padfImag = nullptr;
 };
 
 // The weight of a pixel at distance t, not yet normalised.
@@ -56,12 +59,12 @@ TEST(CplxSarCoeffs, Formula) {
                     EXPECT_NEAR(a, -2.0 * kPi * dfFc * (j - f), 1e-13);
                     const int i = p * nTaps + j;
                     if (nTaps == nCols) {
-                        ASSERT_EQ(oTables.oAcross[i], g / dfSum) << p << ' ' << j;
-                        dfTotal += oTables.oAcross[i];
+                        ASSERT_EQ(oTables.padfAcross[i], g / dfSum) << p << ' ' << j;
+                        dfTotal += oTables.padfAcross[i];
                     }
                     if (nTaps == nRows) {
-                        ASSERT_EQ(oTables.oReal[i], g * std::cos(a) / dfSum) << p << ' ' << j;
-                        ASSERT_EQ(oTables.oImag[i], g * std::sin(a) / dfSum) << p << ' ' << j;
+                        ASSERT_EQ(oTables.padfReal[i], g * std::cos(a) / dfSum) << p << ' ' << j;
+                        ASSERT_EQ(oTables.padfImag[i], g * std::sin(a) / dfSum) << p << ' ' << j;
                     }
                 }
                 EXPECT_NEAR(nTaps == nCols ? dfTotal : 1.0, 1.0, 1e-15);
@@ -76,21 +79,22 @@ TEST(CplxSarCoeffs, TellingFigures) {
     const Tables oPlain(5, 5, 0.0, 64);
     for (int p = 0; p < 64; ++p) {
         const double dfAngle = 2.0 * kPi * 0.25 * (p / 64.0 - 0.5);
-        EXPECT_EQ(oOne.oAcross[p], 1.0);
-        EXPECT_NEAR(oOne.oReal[p], std::cos(dfAngle), 1e-15);
-        EXPECT_NEAR(oOne.oImag[p], std::sin(dfAngle), 1e-15);
+        EXPECT_EQ(oOne.padfAcross[p], 1.0);
+        EXPECT_NEAR(oOne.padfReal[p], std::cos(dfAngle), 1e-15);
+        EXPECT_NEAR(oOne.padfImag[p], std::sin(dfAngle), 1e-15);
         for (int i = 5 * p; i < 5 * p + 5; ++i) {
-            EXPECT_EQ(oPlain.oImag[i], 0.0);
-            EXPECT_EQ(oPlain.oReal[i], oPlain.oAcross[i]);
+            EXPECT_EQ(oPlain.padfImag[i], 0.0);
+            EXPECT_EQ(oPlain.padfReal[i], oPlain.padfAcross[i]);
         }
     }
     // At a whole pixel only the centre tap stands; the carrier counts from the first row.
     const Tables oCarrier(7, 7, 0.1, 64);
     for (int j = 0; j < 7; ++j) {
         const double dfCentre = j == 3 ? 1.0 : 0.0;
-        EXPECT_NEAR(oCarrier.oAcross[32 * 7 + j], dfCentre, 1e-15);
-        EXPECT_NEAR(oCarrier.oReal[32 * 7 + j], dfCentre * std::cos(2.0 * kPi * 0.1 * 3), 1e-15);
-        EXPECT_NEAR(oCarrier.oImag[32 * 7 + j], -dfCentre * std::sin(2.0 * kPi * 0.1 * 3), 1e-15);
+        EXPECT_NEAR(oCarrier.padfAcross[32 * 7 + j], dfCentre, 1e-15);
+        EXPECT_NEAR(oCarrier.padfReal[32 * 7 + j], dfCentre * std::cos(2.0 * kPi * 0.1 * 3), 1e-15);
+        EXPECT_NEAR(oCarrier.padfImag[32 * 7 + j], -dfCentre * std::sin(2.0 * kPi * 0.1 * 3),
+                    1e-15);
     }
 }
 

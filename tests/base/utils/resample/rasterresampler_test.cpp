@@ -1,7 +1,9 @@
 #include <gtest/gtest.h>
 
+#include <array>
 #include <limits>
 #include <memory>
+#include <typeinfo>
 #include <vector>
 
 #include "tests/support/refusal.h"
@@ -71,12 +73,20 @@ TEST(RasterResampler, AllClasses) {
     const Geometry kTwo = {0, 0, 2, 2, 0, 0, 0, 0, 1, 1};
     const Geometry kFour = {-1, -1, 4, 4, 0, 0, -1, -1, 2, 2};
     const Geometry kEight = {-3, -3, 8, 8, 0, 0, -3, -3, 4, 4};
+    const Geometry kSixteen = {-7, -7, 16, 16, 0, 0, -7, -7, 8, 8};
     const Geometry kThreeFive = {0, 0, 3, 5, 1, 1, 0, 0, 3, 5};
+    const Geometry kFourFive = {-1, -2, 4, 5, 0, 0, -1, -2, 2, 2};
     const CoefficientMap oWindow = {{"NUMCOLS", "3"}, {"NUMROWS", "5"}};
     CheckClass<BilinearResampler>(0, kTwo, {});
     CheckClass<CubicResampler>(1, kFour, {});
     CheckClass<CubicPsResampler>(2, kFour, {});
     CheckClass<NearestResampler>(3, kOne, {});
+    ShapingWindow oKaiser, oHann;
+    oKaiser.SetKaiser(2.5);
+    oHann.SetHann();
+    CheckClass<Sinc8Resampler>(4, kEight, {{"SHAPINGWINDOW", "KAISER"}, {"BETA", "2.500000"}},
+                               oKaiser);
+    CheckClass<Sinc16Resampler>(5, kSixteen, {{"SHAPINGWINDOW", "HANN"}}, oHann);
     CheckClass<AverageResampler>(6, kThreeFive, oWindow, 3, 5);
     CheckClass<MedianResampler>(7, kThreeFive, oWindow, 3, 5);
     CheckClass<CplxSarResampler>(
@@ -84,14 +94,40 @@ TEST(RasterResampler, AllClasses) {
         {{"NUMCOLS", "5"}, {"NUMROWS", "7"}, {"FC", "  2.5000000000000000e-01"}}, 5, 7, 0.25);
     CheckClass<Lagrange4Resampler>(9, kFour, {});
     CheckClass<Lagrange8Resampler>(10, kEight, {});
+    const CoefficientMap oGaussian = {
+        {"NUMCOLS", "4"}, {"NUMROWS", "5"}, {"SIGMACOL", "0.500000"}, {"SIGMAROW", "1.250000"}};
+    CheckClass<GaussianResampler>(11, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
+    const CoefficientMap oKernel = {{"NUMCOLS", "4"}, {"NUMROWS", "5"}, {"NUMSUBPIXELS", "2"}};
+    const std::vector<double> vdfWeights(9 * 3, 0.25);
+    CheckClass<KernelResampler>(12, kFourFive, oKernel, 4, 5, 2, vdfWeights);
     CheckClass<SqBilinearResampler>(13, kTwo, {});
     CheckClass<SqCubicResampler>(14, kFour, {});
     CheckClass<SqCubicPsResampler>(15, kFour, {});
     CheckClass<SqNearestResampler>(16, kOne, {});
+    CheckClass<SqSinc8Resampler>(17, kEight, {{"SHAPINGWINDOW", "HANN"}}, oHann);
+    CheckClass<SqSinc16Resampler>(18, kSixteen, {{"SHAPINGWINDOW", "KAISER"}, {"BETA", "2.500000"}},
+                                  oKaiser);
     CheckClass<SqAverageResampler>(19, kThreeFive, oWindow, 3, 5);
     CheckClass<SqMedianResampler>(20, kThreeFive, oWindow, 3, 5);
     CheckClass<SqLagrange4Resampler>(21, kFour, {});
     CheckClass<SqLagrange8Resampler>(22, kEight, {});
+    CheckClass<SqGaussianResampler>(23, kFourFive, oGaussian, 4, 5, 0.5f, 1.25f);
+    CheckClass<SqKernelResampler>(24, kFourFive, oKernel, 4, 5, 2, vdfWeights);
+}
+
+TEST(RasterResampler, SincWeights) {
+    ShapingWindow oWindow;
+    oWindow.SetLanczos();
+    ResampleInfo oEight, oSixteen;
+    Sinc8Resampler::GenerateKernelWeights(oWindow, oEight);
+    Sinc16Resampler::GenerateKernelWeights(oWindow, oSixteen);
+    const auto fnWeights = [](const IRasterResampler& oResampler) {
+        return oResampler.GetResampleInfo().mvdfKernelWeights;
+    };
+    EXPECT_EQ(fnWeights(Sinc8Resampler(oWindow)), oEight.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(SqSinc8Resampler(oWindow)), oEight.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(Sinc16Resampler(oWindow)), oSixteen.mvdfKernelWeights);
+    EXPECT_EQ(fnWeights(SqSinc16Resampler(oWindow)), oSixteen.mvdfKernelWeights);
 }
 
 template <typename R>
@@ -131,15 +167,56 @@ TEST(RasterResampler, CplxSar) {
         ExpectRefusal({"nWndNumRows", 1, sSize, "Positive odd number", "Num rows " + sRest},
                       [&] { CplxSarResampler(7, nSize, 0.6); });
     }
-    for (const auto& [dfFc, sFc] : {std::pair(0.6, "0.600000"), {-0.75, "-0.750000"}}) {
-        ExpectRefusal({"dfFc", 1, sFc, "[-0.5, 0.5]",
-                       FormatString("The given central frequency (%s) must fall in the range "
-                                    "[-0.5, 0.5]",
-                                    sFc)},
-                      [&] { CplxSarResampler(5, 7, dfFc); });
+    for (const double dfFc : {-0.75, 0.6}) {
+        const std::string sFc = FormatString("%f", dfFc);
+        ExpectRefusal(
+            {"dfFc", 1, sFc, "[-0.5, 0.5]",
+             "The given central frequency (" + sFc + ") must fall in the range [-0.5, 0.5]"},
+            [&] { CplxSarResampler(5, 7, dfFc); });
     }
     EXPECT_THROW(CplxSarResampler(5, 7, std::numeric_limits<double>::quiet_NaN()),
                  ParameterException);
+}
+
+template <typename R>
+void CheckKernels() {
+    const std::vector<double> vdfWeights = {1.0, 0.25, 0.5, 0.75};
+    EXPECT_EQ(R(1, 1, 1, vdfWeights).GetResampleInfo().mvdfKernelWeights, vdfWeights);
+    EXPECT_EQ(R(3, 1, 0, vdfWeights).GetResampleInfo().mvdfKernelWeights, vdfWeights);
+    constexpr int kMost = std::numeric_limits<int>::max();
+    for (const int nSize : {0, -3, -kMost - 1}) {
+        const std::string sSize = std::to_string(nSize);
+        const std::string sRest = " for kernel resampler must be a non-zero positive number";
+        ExpectRefusal({"nWndNumCols", 1, sSize, "Non-zero positive number", "Num cols" + sRest},
+                      [&] { R(nSize, nSize, -1, vdfWeights); });
+        ExpectRefusal({"nWndNumRows", 1, sSize, "Non-zero positive number", "Num rows" + sRest},
+                      [&] { R(1, nSize, -1, vdfWeights); });
+    }
+    for (const int nSubPixels : {-1, -kMost - 1}) {
+        ExpectRefusal({"nSubPixels", 1, std::to_string(nSubPixels), "Positive number",
+                       "Num of subpixels for kernel resampler must be a positive number"},
+                      [&] { R(1, 1, nSubPixels, vdfWeights); });
+    }
+    // One weight too few, one too many, none, and products that are 0 in 32 or 64 bits.
+    for (const auto& anSizes : {std::array{2, 3, 0},
+                                {1, 2, 0},
+                                {4, 4, 4},
+                                {1 << 30, 1 << 30, 1},
+                                {kMost, kMost, kMost}}) {
+        try {
+            R(anSizes[0], anSizes[1], anSizes[2], vdfWeights);
+            ADD_FAILURE() << anSizes[0];
+        } catch (const DataException& oCaught) {
+            EXPECT_TRUE(typeid(oCaught) == typeid(DataException));
+            EXPECT_EQ(oCaught.GetMessage(),
+                      "Resampler kernel does not have correct number of weights.");
+        }
+    }
+}
+
+TEST(RasterResampler, Kernels) {
+    CheckKernels<KernelResampler>();
+    CheckKernels<SqKernelResampler>();
 }
 
 // A caller's own class, whose axes have different anchors.

@@ -11,7 +11,7 @@
 
 namespace {
 
-// The stated rules on a text that shrinks.
+// The rules on a text that shrinks.
 struct PlainTokenizer {
     std::string sDelimiter;
     std::string sLeft;
@@ -60,7 +60,7 @@ struct PlainTokenizer {
     }
 };
 
-TEST(StringTokenizer, AsStated) {
+TEST(StringTokenizer, EqualsTheShrinkingText) {
     std::mt19937 oRandom(3);
     const auto fnText = [&oRandom](std::size_t nMin, std::size_t nMax) {
         std::string s(nMin + oRandom() % (nMax - nMin + 1), 'a');

@@ -5,7 +5,6 @@
 #include <cstdint>
 #include <cstring>
 #include <memory>
-#include <typeinfo>
 #include <vector>
 
 #include "randomimages.h"
@@ -60,7 +59,7 @@ TEST_P(Blocks, GiveTheBytesOfOneRun) {
     vpoTfms.push_back(std::make_unique<OddTfm>(nCols, nRows, 1.0));
 
     for (const auto& poTfm : vpoTfms) {
-        SCOPED_TRACE(typeid(*poTfm).name());
+        SCOPED_TRACE(TransformName(*poTfm));
         ResampleBuffer oWhole(eType, nCols, nRows, nChan);
         poResampler->Resample(oSrc.oBuffer, oWhole, *poTfm);
         for (const int nSize : {64, 100, 1000}) {

@@ -11,7 +11,6 @@
 #include <limits>
 #include <memory>
 #include <random>
-#include <typeinfo>
 #include <vector>
 
 #include "randomimages.h"
@@ -68,8 +67,6 @@ std::unique_ptr<IBufPosTfm> MakeTransform(Random& oRandom, int nCols, int nRows,
                                             oRandom.Pick({0.2, 1.0}));
     }
 }
-
-const char* TransformName(const IBufPosTfm& oTfm) { return typeid(oTfm).name(); }
 
 // Window sizes, and weights that need not be those of any filter.
 void SetParameters(Random& oRandom, ResampleInfo& oInfo) {

@@ -44,7 +44,7 @@ class LargeImages : public testing::TestWithParam<ResampleMethod> {
         }
     }
 
-    NativeDataTypeCode Type() const { return GetParam() == eRM_CPLXSAR ? eDT_C8U : eDT_8U; }
+    NativeDataTypeCode Type() const { return GetParam() == eRM_CPLXSAR ? eDT_C16S : eDT_8U; }
 };
 
 TEST_P(LargeImages, TargetsWiderThan65536Columns) {

@@ -1,5 +1,7 @@
 #include "randomimages.h"
 
+#include <typeinfo>
+
 #include "vetra/base/utils/resample/algorithm/kernelresampler.h"
 #include "vetra/base/utils/resample/resamplerfactory.h"
 
@@ -81,6 +83,8 @@ std::unique_ptr<IRasterResampler> MakeResampler(ResampleMethod eMethod) {
     }
     return std::unique_ptr<IRasterResampler>(ResamplerFactory().GetResampler(sParms));
 }
+
+const char* TransformName(const IBufPosTfm& oTfm) { return typeid(oTfm).name(); }
 
 std::vector<ResampleMethod> AllMethods() {
     std::vector<ResampleMethod> veMethods;

@@ -124,6 +124,9 @@ class OddTfm : public vetra::utils::IBufPosTfm {
     double mdfScale;
 };
 
+/// The transform's class, for messages.
+const char* TransformName(const vetra::utils::IBufPosTfm& oTfm);
+
 /// One image with guards around samples and mask.
 struct Image {
     Image(vetra::gobs::NativeDataTypeCode eType, int nCols, int nRows, int nChan, bool bMask)

@@ -2,7 +2,9 @@
 
 #include <cmath>
 #include <cstddef>
+#include <limits>
 #include <memory>
+#include <new>
 
 #include "vetra/base/utils/resample/algorithm/resamplerinfo.h"
 #include "vetra/faultcore/exceptions.h"
@@ -15,10 +17,13 @@ constexpr double kPi = 3.141592653589793;
 
 using Table = std::unique_ptr<double[]>;
 
-// Two sizes and their product fit a size_t; a product that no memory holds is refused by new.
+// The number of elements fits 62 bits. Without the test sanitizers would end the program instead.
 Table MakeTable(int nNumPhases, int nTaps) {
-    return Table(
-        new double[static_cast<std::size_t>(nNumPhases) * static_cast<std::size_t>(nTaps)]);
+    const std::ptrdiff_t nSize = static_cast<std::ptrdiff_t>(nNumPhases) * nTaps;
+    if (nSize > std::numeric_limits<std::ptrdiff_t>::max() / std::ptrdiff_t{sizeof(double)}) {
+        throw std::bad_array_new_length();
+    }
+    return Table(new double[static_cast<std::size_t>(nSize)]);
 }
 
 // The taps of one phase, not yet normalised. Returns their sum.

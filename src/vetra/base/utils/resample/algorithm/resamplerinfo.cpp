@@ -1,5 +1,7 @@
 #include "vetra/base/utils/resample/algorithm/resamplerinfo.h"
 
+#include <cmath>
+
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"
 
@@ -15,6 +17,12 @@ ResampleInfo MethodInfo(ResampleMethod eMethod, const CoefficientMap& oCoefficie
 CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows) {
     return {{"NUMCOLS", FormatString("%d", nWndNumCols)},
             {"NUMROWS", FormatString("%d", nWndNumRows)}};
+}
+
+CoefficientMap KernelCoefficients(int nWndNumCols, int nWndNumRows, int nSubPixels) {
+    CoefficientMap oCoefficients = WindowCoefficients(nWndNumCols, nWndNumRows);
+    oCoefficients["NUMSUBPIXELS"] = FormatString("%d", nSubPixels);
+    return oCoefficients;
 }
 
 namespace {
@@ -71,6 +79,24 @@ void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunc
                          dfFc),
             pszFile, pszFunction, nLine);
     }
+}
+
+void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSigmaRow,
+                   const GaussianTexts& oTexts, const char* pszFile, const char* pszFunction,
+                   std::uint32_t nLine) {
+    CheckWindowSize(nWndNumCols, 1, oTexts.pszCols, kNoLimit, pszFile, pszFunction, nLine);
+    CheckWindowSize(1, nWndNumRows, oTexts.pszRows, kNoLimit, pszFile, pszFunction, nLine);
+    const auto fnCheckSigma = [&](float fSigma, const char* pszArgument, const char* pszAxis) {
+        if (!(fSigma > 0.0f) || std::isinf(fSigma)) {
+            throw ParameterException(
+                pszArgument, ParameterException::eInvalid,
+                FormatString("%f", static_cast<double>(fSigma)), "Positive number",
+                FormatString("%s sigma of %s must be a positive number", pszAxis, oTexts.pszSigma),
+                pszFile, pszFunction, nLine);
+        }
+    };
+    fnCheckSigma(fSigmaCol, "fSigmaCol", "Col");
+    fnCheckSigma(fSigmaRow, "fSigmaRow", "Row");
 }
 
 void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,

@@ -16,6 +16,9 @@ ResampleInfo MethodInfo(ResampleMethod eMethod, const CoefficientMap& oCoefficie
 /// The coefficients "NUMCOLS" and "NUMROWS".
 CoefficientMap WindowCoefficients(int nWndNumCols, int nWndNumRows);
 
+/// The coefficients "NUMCOLS", "NUMROWS" and "NUMSUBPIXELS".
+CoefficientMap KernelCoefficients(int nWndNumCols, int nWndNumRows, int nSubPixels);
+
 /// Sub-pixel phases of the tables that this library makes: a fraction's phases are 0 to 64.
 constexpr int kTabulatedSubPixels = 64;
 
@@ -35,10 +38,33 @@ void CheckCplxSarSize(int nWndNumCols, int nWndNumRows, const char* pszFile,
 void CheckCentralFrequency(double dfFc, const char* pszFile, const char* pszFunction,
                            std::uint32_t nLine);
 
+/// How the messages of a Gaussian resampler name it.
+struct GaussianTexts {
+    const char* pszCols;
+    const char* pszRows;
+    const char* pszSigma;
+};
+constexpr GaussianTexts kGaussianTexts{"gaussian", "gaussian", "gaussian"};
+/// Their odd spellings are what callers know.
+constexpr GaussianTexts kSqGaussianTexts{"guassian", "gaussian", "Gaussian"};
+
+/// Refuses a window of less than one column or row, then a sigma that is not above 0 or not finite,
+/// columns first, with `ParameterException`.
+void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSigmaRow,
+                   const GaussianTexts& oTexts, const char* pszFile, const char* pszFunction,
+                   std::uint32_t nLine);
+
 /// Refuses a window of less than one column or row, then a number of sub-pixels below 0, with
 /// `ParameterException`.
 void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,
                      const char* pszFunction, std::uint32_t nLine);
+
+/// The number of weights of kernels of both axes. No sizes that `CheckKernelSize` lets pass
+/// overflow.
+constexpr long long NumKernelWeights(int nWndNumCols, int nWndNumRows, int nSubPixels) {
+    return (static_cast<long long>(nWndNumCols) + nWndNumRows) *
+           (static_cast<long long>(nSubPixels) + 1);
+}
 
 /// Refuses fewer weights than a method reads, with `ParameterException`.
 void CheckNumWeights(const std::vector<double>& vdfWeights, long long nNeeded, const char* pszFile,

@@ -558,7 +558,7 @@ void Execute(const Task& oTask) {
     for (int i = 0; i < nMaxThreads; ++i) {
         voMemory.push_back(oRun.MakeThreadMemory());
     }
-#pragma omp parallel num_threads(nMaxThreads)
+#pragma omp parallel
     {
         const int nThread = omp_get_thread_num();
         const long long nThreads = omp_get_num_threads();
