@@ -126,9 +126,8 @@ void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nS
         if (nSrcLast >= 0) {
             oStrip.nSrcCount = nSrcLast - oStrip.nSrcFirst + 1;
         }
-        if (oStrip.nSrcCount > std::int64_t{kMostReduction} * oStrip.nNumCols + nWndCols + kLanes) {
-            return;
-        }
+        mbReduces = mbReduces || oStrip.nSrcCount > std::int64_t{kMostReduction} * oStrip.nNumCols +
+                                                        nWndCols + kLanes;
         for (int i = nFirst; i < nFirst + oStrip.nNumCols; i += kLanes) {
             PickGroup& oGroup = mvoGroups[static_cast<std::size_t>(i / kLanes)];
             std::int64_t nLeast = -1;
