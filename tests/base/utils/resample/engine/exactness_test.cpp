@@ -286,6 +286,47 @@ TEST_P(Exactness, ScalesEqualPlainEvaluation) {
     }
 }
 
+// Windows at unit scale, where those of neighbours overlap: every size up to the larger ones, and
+// positions that begin outside.
+class UnitScale : public Exactness {};
+
+TEST_P(UnitScale, EqualsPlainEvaluation) {
+    const ResampleMethod eMethod = GetParam();
+    Random oRandom(5);
+    for (const NativeDataTypeCode eType : {eDT_8U, eDT_8S, eDT_16U, eDT_16S, eDT_32S, eDT_32R}) {
+        for (const int nSize : {1, 2, 3, 4, 5, 6, 7, 9, 11, 16, 17}) {
+            ResampleInfo oInfo;
+            oInfo.meMethod = eMethod;
+            oInfo.mbClampBgd = false;
+            const int nCols = oRandom.Pick({nSize, 1, 3, 5});
+            const int nRows = nSize;
+            if (eMethod == eRM_SQMEDIAN && nSize > 11) continue;
+            oInfo.moCoefficients["NUMCOLS"] = std::to_string(nCols);
+            oInfo.moCoefficients["NUMROWS"] = std::to_string(nRows);
+            const int nTgtCols = oRandom.Pick({31, 64, 100, 300});
+            Image oSrc(eType, 290, 60, 1, false);
+            FillSamples(oRandom, eType, oSrc.oSamples.Get(), oSrc.nSamples);
+            const double dfRowScale = oRandom.Pick({1.0, 1.0, -1.0, 2.0, 0.5});
+            const BufPosScaleOffTfm oTfm(nTgtCols, 50, 1.0, oRandom.Pick({0.0, -3.0, 2.25}),
+                                         dfRowScale, dfRowScale < 0 ? 55.0 : -2.0, 0, 0);
+            ResampleBuffer oWant(eType, nTgtCols, 50, 1);
+            std::vector<unsigned char> vbyOutcome;
+            ReferenceResample(oSrc.oBuffer, oWant, oTfm, oInfo, vbyOutcome);
+            for (const engine::Level eLevel : engine::GetSupportedLevels()) {
+                ResampleBuffer oTgt(eType, nTgtCols, 50, 1);
+                engine::RunOptions oOptions;
+                oOptions.eLevel = eLevel;
+                engine::Resample(oSrc.oBuffer, oTgt, oTfm, oInfo, oOptions);
+                ASSERT_EQ(0, std::memcmp(oWant.GetBuf(), oTgt.GetBuf(),
+                                         vbyOutcome.size() * static_cast<std::size_t>(
+                                                                 DataTypeAdapter::ByteSize(eType))))
+                    << engine::GetStages(eLevel).pszName << " window " << nCols << " x " << nRows
+                    << " type " << eType << " of " << nTgtCols << " columns";
+            }
+        }
+    }
+}
+
 // Whatever stands under a mask byte of 0, no target pixel shows it.
 TEST_P(Exactness, MaskedSamplesNeverShow) {
     const bool bComplex = GetParam() == eRM_CPLXSAR;
@@ -325,6 +366,10 @@ TEST_P(Exactness, MaskedSamplesNeverShow) {
 }
 
 INSTANTIATE_TEST_SUITE_P(Methods, Exactness, testing::ValuesIn(AllMethods()), MethodName);
+
+INSTANTIATE_TEST_SUITE_P(Statistics, UnitScale,
+                         testing::Values(eRM_AVERAGE, eRM_MEDIAN, eRM_SQAVERAGE, eRM_SQMEDIAN),
+                         MethodName);
 
 // A forced level is the one that runs, and the best one is the default.
 TEST(Levels, AreDistinctAndOrdered) {

@@ -52,7 +52,7 @@ TEST_P(LargeImages, TargetsWiderThan65536Columns) {
     Random oRandom(3);
     Image oSrc(Type(), 300, 40, 1, false);
     FillSamples(oRandom, Type(), oSrc.oSamples.Get(), oSrc.nSamples);
-    Compare(oSrc.oBuffer, BufPosScaleOffTfm(kCols, 1, 300.0 / kCols, 0.0, 1.0, 20.3, 0, 0));
+    Compare(oSrc.oBuffer, BufPosScaleOffTfm(kCols, 2, 300.0 / kCols, 0.0, 1.0, 20.3, 0, 0));
 
     std::vector<float> vfCol;
     std::vector<float> vfRow;

@@ -29,6 +29,8 @@ namespace vetra::utils::engine {
 
 namespace {
 
+constexpr int kMostTabulatedCols = 1 << 20;
+
 // Sets of modes.
 constexpr unsigned kSetBackground = 1u << ePO_BACKGROUND;
 constexpr unsigned kSetInterpolated = 1u << ePO_INTERPOLATED;
@@ -205,7 +207,9 @@ Run::Run(const Task& oTask)
         if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
         }
-        if (moPositions.IsAxisAligned(oTask.nTgtCols)) {
+        // Tables of a single row would be made for nothing, and those of very wide ones are large.
+        if (oTask.nTgtRows > 1 && oTask.nTgtCols <= kMostTabulatedCols &&
+            moPositions.IsAxisAligned(oTask.nTgtCols)) {
             moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits, moModes);
             moRowPlan = RowPlan(oTask, moStages, moColumns);
         }

@@ -10,8 +10,8 @@ namespace {
 
 constexpr int kWidestStrip = 2048;
 static_assert(kWidestStrip % kSpanPixels == 0);
-// What a thread's rows should fit into: a part of the second-level cache.
-constexpr double kCacheBytes = 384.0 * 1024;
+// What a thread keeps should fit into a part of the second-level cache.
+constexpr double kCacheBytes = 512.0 * 1024;
 // More than that is not kept at all.
 constexpr double kMostBytes = 64.0 * 1024 * 1024;
 // Source columns per target column beyond which rows hold too much that nobody reads.
@@ -80,7 +80,10 @@ double RowPlan::GetRowBytes(const Task& oTask) const {
         case RowKind::eDoubles:
             return dfDoubles * dfWidest * oTask.poMethod->oWindow.nRows;
         case RowKind::eFiltered:
-            return dfDoubles * mnStripCols * oTask.poMethod->oWindow.nRows;
+            return dfDoubles * mnStripCols * oTask.poMethod->oWindow.nRows +
+                   (mpoRows->bTabulated ? sizeof(double) * static_cast<double>(mnStripCols) *
+                                              oTask.poMethod->oWindow.nCols
+                                        : 0.0);
         case RowKind::eSums:
             return 2 * dfDoubles * dfWidest;
         case RowKind::eMedians:
