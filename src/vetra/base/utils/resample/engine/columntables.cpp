@@ -5,6 +5,38 @@
 
 namespace vetra::utils::engine {
 
+namespace {
+
+// The samples of eight neighbouring columns lie close together unless the scale is large: one load
+// and a shuffle replace eight loads.
+std::vector<PairGroup> MakePairGroups(const Task& oTask, const ColumnTables& oColumns) {
+    const Method& oMethod = *oTask.poMethod;
+    if (oMethod.eValues == eVR_NONE || oMethod.oWindow.nCols != 2 || oTask.nChan != 1 ||
+        kSampleBytes[oTask.nSrcType] != 1 || oTask.nSrcCols < PairGroup::kBytes) {
+        return {};
+    }
+    std::vector<PairGroup> voGroups(static_cast<std::size_t>(oTask.nTgtCols) / kLanes + 1);
+    const std::int64_t* panOffset = oColumns.vnWindow.data();
+    for (PairGroup& oGroup : voGroups) {
+        const auto [itFirst, itLast] = std::minmax_element(panOffset, panOffset + kLanes);
+        // The load ends with the row at the latest, so it stays in the source.
+        oGroup.nOffset = std::min<std::int64_t>(*itFirst, oTask.nSrcCols - PairGroup::kBytes);
+        if (*itLast + 1 - oGroup.nOffset >= PairGroup::kBytes) {
+            oGroup.nOffset = -1;
+        } else {
+            for (int i = 0; i < kLanes; ++i) {
+                const auto nPlace = static_cast<unsigned char>(panOffset[i] - oGroup.nOffset);
+                oGroup.abyPlace[i] = nPlace;
+                oGroup.abyPlace[kLanes + i] = static_cast<unsigned char>(nPlace + 1);
+            }
+        }
+        panOffset += kLanes;
+    }
+    return voGroups;
+}
+
+}  // namespace
+
 ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
                               const Positions& oPositions, const ClassLimits& oLimits,
                               const ModeTable& oModes) {
@@ -48,6 +80,7 @@ ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
             vbyMode[i] = oModes.Get(ePO_INTERPOLATED, oColumns.vbyClass[i] & nRowClass);
         }
     }
+    oColumns.voGroups = MakePairGroups(oTask, oColumns);
     return oColumns;
 }
 

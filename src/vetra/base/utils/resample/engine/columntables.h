@@ -22,6 +22,8 @@ struct ColumnTables {
     std::vector<unsigned char> vbyClass;
     // Modes by the class of the row, where no mask has a say.
     std::vector<unsigned char> avbyMode[4];
+    // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
+    std::vector<PairGroup> voGroups;
 };
 
 /// Throws std::bad_alloc.

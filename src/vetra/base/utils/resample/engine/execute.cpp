@@ -51,6 +51,7 @@ struct Span {
     const double* padfFracCol = nullptr;
     const double* padfFracRow = nullptr;
     const unsigned char* pabyWindowMask = nullptr;
+    const PairGroup* poGroups = nullptr;
     // Has the values of the windows where it isn't null; else they are made of source samples.
     RowCache* poRows = nullptr;
     int nFirstCol = 0;
@@ -79,22 +80,6 @@ struct ValueArrays {
     alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
     double* padfScratch = nullptr;
 };
-
-// Roots of all samples of the types 8U and 8S, by their bits; 0 for negative ones.
-struct RootTables {
-    RootTables() {
-        for (int i = 0; i < 256; ++i) {
-            adf[0][i] = std::sqrt(static_cast<double>(i));
-            adf[1][i] = i < 128 ? adf[0][i] : 0.0;
-        }
-    }
-    double adf[2][256];
-};
-
-const RootTables& GetRoots() {
-    static const RootTables kRoots;
-    return kRoots;
-}
 
 unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
     // Mostly they are all the same: every byte equals the one behind it.
@@ -159,7 +144,6 @@ class Run {
     const Task& moTask;
     const Method& moMethod;
     const LevelStages& moStages;
-    const RootTables& moRoots;
     Positions moPositions;
     ModeTable moModes;
     ClassLimits moLimits;
@@ -180,7 +164,6 @@ Run::Run(const Task& oTask)
     : moTask(oTask),
       moMethod(*oTask.poMethod),
       moStages(GetStages(oTask.oOptions.eLevel)),
-      moRoots(GetRoots()),
       moPositions(*oTask.poTfm),
       moModes(moMethod.eRule, oTask.eFillAction),
       mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
@@ -384,6 +367,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, R
         oSpan.padfFracCol = moColumns.vdfFrac.data() + nCol;
         oSpan.panWindow = moColumns.vnWindow.data() + nCol;
         oSpan.panNearest = moColumns.vnNearest.data() + nCol;
+        oSpan.poGroups = moColumns.voGroups.empty() || nCol % kLanes != 0
+                             ? nullptr
+                             : moColumns.voGroups.data() + nCol / kLanes;
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
         } else {
@@ -436,10 +422,9 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.nPitch = mnPitch;
     oWindows.nChan = moTask.nChan;
     oWindows.pabyMask = oSpan.pabyWindowMask;
+    oWindows.poGroups = oSpan.poGroups;
     oWindows.pParameters = moTask.pParameters;
     oWindows.padfScratch = oValues.padfScratch;
-    oWindows.padfRoots[0] = moRoots.adf[0];
-    oWindows.padfRoots[1] = moRoots.adf[1];
     for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
         double* padfValue = oValues.adfValue;
         if (bWindows && oSpan.poRows != nullptr) {

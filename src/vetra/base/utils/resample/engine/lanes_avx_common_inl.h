@@ -295,6 +295,15 @@ inline F64 LoadSamples(const T* p) {
     }
 }
 
+template <typename T>
+inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {
+    const __m128i v =
+        _mm_shuffle_epi8(_mm_loadu_si128(reinterpret_cast<const __m128i*>(p)),
+                         _mm_loadu_si128(reinterpret_cast<const __m128i*>(pabyPlace)));
+    a = FromInt32(Widen<T>(v));
+    b = FromInt32(Widen<T>(_mm_srli_si128(v, 8)));
+}
+
 // Copies the eight samples at the offsets.
 template <typename T>
 inline void CopySamples(T* t, const T* p, const std::int64_t* o) {

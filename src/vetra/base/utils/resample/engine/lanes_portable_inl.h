@@ -160,6 +160,15 @@ inline F64 LoadSamples(const T* p) {
 }
 
 template <typename T>
+inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {
+    for (int i = 0; i < kParts; ++i) {
+        const unsigned char* q = pabyPlace + 2 * i;
+        a.v[i] = Pair{static_cast<double>(p[q[0]]), static_cast<double>(p[q[1]])};
+        b.v[i] = Pair{static_cast<double>(p[q[kLanes]]), static_cast<double>(p[q[kLanes + 1]])};
+    }
+}
+
+template <typename T>
 inline void CopySamples(T* t, const T* p, const std::int64_t* panOffset) {
     for (int i = 0; i < kLanes; ++i) {
         t[i] = p[panOffset[i]];

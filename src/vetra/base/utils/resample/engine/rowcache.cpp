@@ -49,7 +49,9 @@ RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTabl
 
 RowKind RowPlan::ChooseKind(const Task& oTask) const {
     const Method& oMethod = *oTask.poMethod;
-    if (mpoRows->pfnValues == nullptr || mbReduces) {
+    // Four samples are read sooner from the source than from rows that are made first, unless they
+    // are roots.
+    if (mpoRows->pfnValues == nullptr || mbReduces || oMethod.eValues == eVR_BILINEAR) {
         return RowKind::eNone;
     }
     if (oMethod.eValues == eVR_AVERAGE && SumsAreExact(oTask)) {

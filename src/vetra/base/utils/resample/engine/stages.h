@@ -80,6 +80,15 @@ struct RowWindows {
     int nPix;
 };
 
+/// How to pick the pairs of samples of eight pixels out of sixteen adjacent 8-bit samples.
+struct PairGroup {
+    static constexpr int kBytes = 16;
+    /// Of the sixteen samples, from the start of the row; below 0 where they don't hold all pairs.
+    std::int64_t nOffset;
+    /// Places of the first samples, then of the second ones.
+    unsigned char abyPlace[kBytes];
+};
+
 /// The windows of a span, in mode 1, as the methods see them. Pixels of other modes have offset 0:
 /// a stage may compute them, but nobody uses what comes out.
 struct WindowSpan {
@@ -97,10 +106,11 @@ struct WindowSpan {
     std::int64_t nPitch;
     /// Samples from a pixel to the next.
     int nChan;
+    /// Of each eight pixels, for 8-bit samples and windows of two columns in an axis-aligned run of
+    /// one channel; else null.
+    const PairGroup* poGroups;
     /// What the method prepared for the run; may be null.
     const void* pParameters;
-    /// Roots of the 256 samples of the types 8U and 8S, by their bits.
-    const double* padfRoots[2];
     /// The thread's own working memory, as much as the method asked for; null if it didn't.
     double* padfScratch;
 };

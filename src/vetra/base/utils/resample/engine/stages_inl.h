@@ -17,6 +17,7 @@
 //                                neither of two adjacent bytes is 0
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
+//   ShufflePairs                 pairs of samples out of sixteen, as a PairGroup says
 //   GatherQuad                   four adjacent samples at eight offsets
 //   GatherNear                   doubles at eight offsets below kNearReach
 //   LoadSamples                  eight adjacent samples
@@ -74,10 +75,10 @@ namespace {
         Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), \
             Entry(unsigned int), Entry(int), nullptr, nullptr, nullptr, nullptr        \
     }
-#define VETRA_PER_SMALL_INTEGER(Entry)                                                  \
-    {                                                                                   \
-        Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), \
-            nullptr, nullptr, nullptr, nullptr, nullptr, nullptr                        \
+#define VETRA_PER_SMALL_INTEGER(Entry)                                                          \
+    {                                                                                           \
+        Entry(unsigned char), Entry(signed char), Entry(unsigned short), Entry(short), nullptr, \
+            nullptr, nullptr, nullptr, nullptr, nullptr                                         \
     }
 #define VETRA_VALUES(Method, T) &Values<Method, T>
 #define VETRA_COMPLEX_VALUES(Method, T) &ComplexValues<Method, T>

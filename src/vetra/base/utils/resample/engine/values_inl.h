@@ -36,6 +36,15 @@ template <typename Method, typename T, bool kSingleChannel>
 void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
     ForEachGroup<T, kSingleChannel>(
         oSpan, pSrc, [&](int i, const WindowReader<T, kSingleChannel>& oWindow, F64 dx, F64 dy) {
+            if constexpr (sizeof(T) == 1 && kSingleChannel && Method::kSize == 2) {
+                const PairGroup* poGroup =
+                    oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
+                if (poGroup != nullptr && poGroup->nOffset >= 0) {
+                    const GroupReader<T> oGroup{pSrc, poGroup, oSpan.nPitch};
+                    StoreValue(padfValue + i, Method::Value(oGroup, dx, dy));
+                    return;
+                }
+            }
             StoreValue(padfValue + i, Method::Value(oWindow, dx, dy));
         });
 }

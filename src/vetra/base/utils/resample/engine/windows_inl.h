@@ -63,9 +63,6 @@ inline void GatherDownTaps(const KernelTables& oTables, F64 fracRow, double* pad
     GatherTaps(oTables.padfDown, oTables.nRows, Phase(fracRow, nSubPixels, nSubPixels), padfTaps);
 }
 
-template <typename T>
-inline constexpr int kIsSigned8 = T(-1) < T(0) ? 1 : 0;
-
 // Windows of source samples, for one channel.
 template <typename T, bool kSingleChannel>
 struct WindowReader {
@@ -83,8 +80,9 @@ struct WindowReader {
             if constexpr (kSingleChannel) {
                 GatherPair(At(nRow, j), panOffset, p[j], p[j + 1]);
             } else {
-                p[j] = Sample(nRow, j);
-                p[j + 1] = Sample(nRow, j + 1);
+                const T* q = At(nRow, j);
+                p[j] = Gather(q, panOffset);
+                p[j + 1] = Gather(q + oSpan.nChan, panOffset);
             }
         }
     }
@@ -100,17 +98,6 @@ struct WindowReader {
     }
 
     F64 Sample(int nRow, int nCol) const { return Gather(At(nRow, nCol), panOffset); }
-
-    // Its root: of 8-bit samples there is a table, since a root takes longer than reading one.
-    static constexpr bool kHasRoots = sizeof(T) == 1;
-    F64 SampleRoot(int nRow, int nCol) const {
-        const T* p = At(nRow, nCol);
-        std::int64_t anPlace[kLanes];
-        for (int i = 0; i < kLanes; ++i) {
-            anPlace[i] = static_cast<unsigned char>(p[panOffset[i]]);
-        }
-        return Gather(oSpan.padfRoots[kIsSigned8<T>], anPlace);
-    }
 
     // That sample and the one of the next channel.
     void ChannelPair(int nRow, int nCol, F64& first, F64& second) const {
@@ -165,6 +152,18 @@ struct WindowReader {
     }
 };
 
+// The same where sixteen adjacent samples hold all pairs.
+template <typename T>
+struct GroupReader {
+    const T* pFirst;
+    const PairGroup* poGroup;
+    std::int64_t nPitch;
+
+    void Row(int nRow, F64 (&p)[2]) const {
+        ShufflePairs(pFirst + nRow * nPitch + poGroup->nOffset, poGroup->abyPlace, p[0], p[1]);
+    }
+};
+
 // The square root of a sample that is greater than 0; 0 for every other one, NaN included.
 inline F64 Root(F64 sample) {
     const F64 zero = Set1(0.0);
@@ -178,36 +177,18 @@ struct RootReader {
 
     template <int N>
     void Row(int nRow, F64 (&p)[N]) const {
-        if constexpr (Window::kHasRoots) {
-            for (int j = 0; j < N; ++j) {
-                p[j] = oWindow.SampleRoot(nRow, j);
-            }
-        } else {
-            oWindow.Row(nRow, p);
-            for (int j = 0; j < N; ++j) {
-                p[j] = Root(p[j]);
-            }
+        oWindow.Row(nRow, p);
+        for (int j = 0; j < N; ++j) {
+            p[j] = Root(p[j]);
         }
     }
     void Quad(int nRow, int nCol, F64 (&p)[4]) const {
-        if constexpr (Window::kHasRoots) {
-            for (int j = 0; j < 4; ++j) {
-                p[j] = oWindow.SampleRoot(nRow, nCol + j);
-            }
-        } else {
-            oWindow.Quad(nRow, nCol, p);
-            for (int j = 0; j < 4; ++j) {
-                p[j] = Root(p[j]);
-            }
+        oWindow.Quad(nRow, nCol, p);
+        for (int j = 0; j < 4; ++j) {
+            p[j] = Root(p[j]);
         }
     }
-    F64 Sample(int nRow, int nCol) const {
-        if constexpr (Window::kHasRoots) {
-            return oWindow.SampleRoot(nRow, nCol);
-        } else {
-            return Root(oWindow.Sample(nRow, nCol));
-        }
-    }
+    F64 Sample(int nRow, int nCol) const { return Root(oWindow.Sample(nRow, nCol)); }
     template <typename Parameters>
     const Parameters& Get() const {
         return oWindow.template Get<Parameters>();
