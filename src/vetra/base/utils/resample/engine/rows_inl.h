@@ -52,8 +52,11 @@ void Across(const RowWindows& oRows, const double* padfRow, double* padfFiltered
         nTaps = static_cast<const KernelTables*>(oRows.pParameters)->nCols;
     }
     ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
-        const Filter oAcross(FilterInput{Load(oRows.padfFracCol + i),
-                                         oRows.padfColumnTaps + std::int64_t{i} * nTaps, nTaps});
+        FilterInput oInput{Load(oRows.padfFracCol + i), nullptr, nTaps};
+        if constexpr (Filter::kTabulated) {
+            oInput.padfTaps = oRows.padfColumnTaps + std::int64_t{i} * nTaps;
+        }
+        const Filter oAcross(oInput);
         Store(padfFiltered + i, oAcross.Value([&](int j) { return oWindow.Pick(padfRow, j); }));
     });
 }
