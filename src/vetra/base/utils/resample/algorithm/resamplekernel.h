@@ -9,39 +9,44 @@
 #include "vetra/base/utils/resample/engine/sample.h"
 #include "vetra/faultcore/exceptions.h"
 
-/// Separable convolution with tabulated weights: the columns' kernels of phases 0 to nSubPixels,
-/// then the rows'. vdfWeights has at least as many weights. \throws ParameterException for a window
-/// of less than one column or row, or nSubPixels below 0.
+namespace vetra::utils::engine {
+
+/// Runs a method with the weights of kernels: those of the columns for phases 0 to nSubPixels, then
+/// those of the rows. vdfWeights has at least as many.
+///
+/// \throws ParameterException for a window of less than one column or row, or nSubPixels below 0.
+template <typename Tin, typename Tout>
+void SampleKernel(const SamplingArguments<Tin, Tout>& oArgs, const Method& oKernelMethod,
+                  NodataFillAction eFillAction, int nWndNumCols, int nWndNumRows, int nSubPixels,
+                  const std::vector<double>& vdfWeights) {
+    CheckKernelSize(nWndNumCols, nWndNumRows, nSubPixels, VETRA_HERE);
+    const double* padfWeights = vdfWeights.data();
+    const KernelTables oTables{padfWeights,
+                               padfWeights + (std::ptrdiff_t{nSubPixels} + 1) * nWndNumCols,
+                               nWndNumCols, nWndNumRows, nSubPixels};
+    const Method oMethod =
+        WithWindow(oKernelMethod, CentredWindow(nWndNumCols, nWndNumRows, false));
+    Sample(oArgs, oMethod, eFillAction, &oTables);
+}
+
+}  // namespace vetra::utils::engine
+
+/// Separable convolution with tabulated weights; see `SampleKernel`.
 template <typename Tin, typename Tout>
 void ResampleKernel(const vetra::utils::engine::SamplingArguments<Tin, Tout>& oArgs,
                     vetra::utils::NodataFillAction eFillAction, int nWndNumCols, int nWndNumRows,
                     int nSubPixels, const std::vector<double>& vdfWeights) {
-    using namespace vetra::utils;
-    CheckKernelSize(nWndNumCols, nWndNumRows, nSubPixels, VETRA_HERE);
-    const double* padfWeights = vdfWeights.data();
-    const engine::KernelTables oTables{padfWeights,
-                                       padfWeights + (std::ptrdiff_t{nSubPixels} + 1) * nWndNumCols,
-                                       nWndNumCols, nWndNumRows, nSubPixels};
-    const engine::Method oMethod = engine::WithWindow(
-        engine::kKernelMethod, engine::CentredWindow(nWndNumCols, nWndNumRows, false));
-    engine::Sample(oArgs, oMethod, eFillAction, &oTables);
+    vetra::utils::engine::SampleKernel(oArgs, vetra::utils::engine::kKernelMethod, eFillAction,
+                                       nWndNumCols, nWndNumRows, nSubPixels, vdfWeights);
 }
 
 /// As its plain twin, on the square roots of the samples, with the result squared.
-/// \throws ParameterException for a window of less than one column or row, or nSubPixels below 0.
 template <typename Tin, typename Tout>
 void ResampleSqKernel(const vetra::utils::engine::SamplingArguments<Tin, Tout>& oArgs,
                       vetra::utils::NodataFillAction eFillAction, int nWndNumCols, int nWndNumRows,
                       int nSubPixels, const std::vector<double>& vdfWeights) {
-    using namespace vetra::utils;
-    CheckKernelSize(nWndNumCols, nWndNumRows, nSubPixels, VETRA_HERE);
-    const double* padfWeights = vdfWeights.data();
-    const engine::KernelTables oTables{padfWeights,
-                                       padfWeights + (std::ptrdiff_t{nSubPixels} + 1) * nWndNumCols,
-                                       nWndNumCols, nWndNumRows, nSubPixels};
-    const engine::Method oMethod = engine::WithWindow(
-        engine::kSqKernelMethod, engine::CentredWindow(nWndNumCols, nWndNumRows, false));
-    engine::Sample(oArgs, oMethod, eFillAction, &oTables);
+    vetra::utils::engine::SampleKernel(oArgs, vetra::utils::engine::kSqKernelMethod, eFillAction,
+                                       nWndNumCols, nWndNumRows, nSubPixels, vdfWeights);
 }
 
 #endif  // VETRA_BASE_UTILS_RESAMPLE_ALGORITHM_RESAMPLEKERNEL_H
