@@ -20,6 +20,7 @@
 #include <memory>
 #include <vector>
 
+#include "vetra/base/utils/resample/engine/aligneddoubles.h"
 #include "vetra/base/utils/resample/engine/columntables.h"
 #include "vetra/base/utils/resample/engine/positions.h"
 #include "vetra/base/utils/resample/engine/rowcache.h"
@@ -99,7 +100,7 @@ class Run {
 
     // What a thread needs beside the stack. Throws std::bad_alloc.
     struct ThreadMemory {
-        std::unique_ptr<double[]> padfScratch;
+        AlignedDoubles padfScratch;
         std::unique_ptr<RowCache> poRows;
     };
     ThreadMemory MakeThreadMemory() const;
@@ -207,7 +208,7 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
         if (moRowPlan.GetKind() != RowKind::eNone) {
             oMemory.poRows = std::make_unique<RowCache>(moTask, moRowPlan);
         } else if (moMethod.eScratch != Scratch::eNone) {
-            oMemory.padfScratch.reset(new double[GetScratchSize(moMethod)]);
+            oMemory.padfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
         }
     }
     return oMemory;

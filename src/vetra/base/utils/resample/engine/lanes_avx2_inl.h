@@ -57,6 +57,24 @@ inline F64 RoundEven(F64 a) {
 }
 inline F64 Sqrt(F64 a) { return {_mm256_sqrt_pd(a.lo), _mm256_sqrt_pd(a.hi)}; }
 
+inline F64 FusedMultiplyAdd(F64 a, F64 b, F64 c) {
+    return {_mm256_fmadd_pd(a.lo, b.lo, c.lo), _mm256_fmadd_pd(a.hi, b.hi, c.hi)};
+}
+template <int N>
+inline bool AnyTiny(const F64 (&x)[N]) {
+    // Every exponent from 2^-511 on has one of the two upper bits, here moved into bit 63.
+    const auto fnLarge = [](__m256d v) {
+        const __m256i n = _mm256_castpd_si256(v);
+        return _mm256_or_si256(_mm256_slli_epi64(n, 1), _mm256_slli_epi64(n, 2));
+    };
+    __m256i vLarge = _mm256_set1_epi64x(-1);
+    for (int k = 0; k < N; ++k) {
+        vLarge = _mm256_and_si256(vLarge, fnLarge(x[k].lo));
+        vLarge = _mm256_and_si256(vLarge, fnLarge(x[k].hi));
+    }
+    return _mm256_movemask_pd(_mm256_castsi256_pd(vLarge)) != 0xf && AnySmallNumber(x);
+}
+
 inline unsigned Bits(B64 b) {
     return static_cast<unsigned>(_mm256_movemask_pd(b.lo) | _mm256_movemask_pd(b.hi) << 4);
 }
@@ -111,4 +129,6 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
 
-inline F64 GatherNear(const double* p, const std::int64_t* o) { return Gather(p, o); }
+inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
+    return Gather(p + nShift, o);
+}

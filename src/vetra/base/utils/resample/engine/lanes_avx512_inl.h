@@ -36,6 +36,22 @@ inline F64 RoundEven(F64 a) {
 
 inline F64 Sqrt(F64 a) { return {_mm512_sqrt_pd(a.v)}; }
 
+inline F64 FusedMultiplyAdd(F64 a, F64 b, F64 c) { return {_mm512_fmadd_pd(a.v, b.v, c.v)}; }
+template <int N>
+inline bool AnyTiny(const F64 (&x)[N]) {
+    // Every exponent from 2^-511 on has one of the two upper bits, here moved into bit 62.
+    __m512i vLarge = _mm512_castpd_si512(x[0].v);
+    vLarge = _mm512_or_si512(vLarge, _mm512_slli_epi64(vLarge, 1));
+    for (int k = 1; k < N; ++k) {
+        const __m512i v = _mm512_castpd_si512(x[k].v);
+        vLarge = _mm512_ternarylogic_epi64(vLarge, v, _mm512_slli_epi64(v, 1), 0xe0);
+    }
+    if (_mm512_testn_epi64_mask(vLarge, _mm512_set1_epi64(std::int64_t{1} << 62)) == 0) {
+        return false;
+    }
+    return AnySmallNumber(x);
+}
+
 inline unsigned Bits(B64 b) { return b.m; }
 inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
     const __mmask16 m = _mm_cmpeq_epi8_mask(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
@@ -66,9 +82,9 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
     _mm512_storeu_si512(p, _mm512_cvttpd_epi64(a.v));
 }
 
-inline F64 GatherNear(const double* p, const std::int64_t* o) {
-    return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), _mm512_loadu_si512(o),
-                                   _mm512_loadu_pd(p + kLanes))};
+inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
+    const __m512i vPlace = _mm512_add_epi64(_mm512_loadu_si512(o), _mm512_set1_epi64(nShift));
+    return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), vPlace, _mm512_loadu_pd(p + kLanes))};
 }
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"

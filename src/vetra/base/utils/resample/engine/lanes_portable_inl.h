@@ -53,6 +53,19 @@ inline F64 ZeroWhere(B64 m, F64 a) {
     return a;
 }
 
+// Without a fused multiply-add nothing is gained by reciprocals.
+inline F64 DivideBy(F64 x, const Divisor& oDivisor) {
+    F64 r;
+    for (int i = 0; i < kParts; ++i) {
+        r.v[i] = x.v[i] / oDivisor.dfValue;
+    }
+    return r;
+}
+template <int N>
+inline bool AnyTiny(const F64 (&)[N]) {
+    return false;
+}
+
 inline F64 Set1(double df) {
     const Pair v{df, df};
     return {{v, v, v, v}};
@@ -147,8 +160,8 @@ inline void GatherQuad(const T* p, const std::int64_t* panOffset, F64 (&q)[4]) {
         q[j] = Gather(p + j, panOffset);
     }
 }
-inline F64 GatherNear(const double* p, const std::int64_t* panOffset) {
-    return Gather(p, panOffset);
+inline F64 GatherNear(const double* p, const std::int64_t* panOffset, int nShift) {
+    return Gather(p + nShift, panOffset);
 }
 template <typename T>
 inline F64 LoadSamples(const T* p) {

@@ -60,9 +60,9 @@ inline F64 Anchor(const ClassLimits& oLimits, F64 pos) {
     return oLimits.bAnchorNearest ? Nearest(pos) : Floor(pos);
 }
 
-void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCol,
-             const double* padfRow, int nPix, unsigned char* pabyClass, std::int64_t* panWindow,
-             std::int64_t* panNearest) {
+VETRA_STAGE void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCol,
+                         const double* padfRow, int nPix, unsigned char* pabyClass,
+                         std::int64_t* panWindow, std::int64_t* panNearest) {
     const Limits oLimits(oClassLimits);
     const F64 pitch = Set1(nSrcCols);
     const F64 first = Set1(oClassLimits.dfRowOff * nSrcCols + oClassLimits.dfColOff);
@@ -78,8 +78,8 @@ void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCo
     }
 }
 
-void MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                 const std::int64_t* panNearest, int nPix, unsigned char* pabyClass) {
+VETRA_STAGE void MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                             const std::int64_t* panNearest, int nPix, unsigned char* pabyClass) {
     for (int i = 0; i < nPix; i += kLanes) {
         unsigned char* pabyGroup = pabyClass + i;
         // Where nothing fits the source may be smaller than a window.
@@ -109,9 +109,9 @@ void MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
     }
 }
 
-unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char nFallback,
-                   const double* padfCol, const double* padfRow, int nPix,
-                   unsigned char* pabyMode) {
+VETRA_STAGE unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow,
+                               unsigned char nFallback, const double* padfCol,
+                               const double* padfRow, int nPix, unsigned char* pabyMode) {
     const Limits oLimits(oClassLimits);
     unsigned nFitAny = 0;
     unsigned nNearAny = 0;
@@ -132,9 +132,10 @@ unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow, unsigned char 
     return (nNoneAny != 0 ? 1u : 0u) | (nFitAny != 0 ? 2u : 0u) | (nNearAny != 0 ? 4u : 0u);
 }
 
-void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan, const double* padfCol,
-             const double* padfRow, const unsigned char* pabyMode, int nPix,
-             std::int64_t* panOffset, double* padfFracCol, double* padfFracRow) {
+VETRA_STAGE void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan,
+                         const double* padfCol, const double* padfRow,
+                         const unsigned char* pabyMode, int nPix, std::int64_t* panOffset,
+                         double* padfFracCol, double* padfFracRow) {
     // Offsets are whole numbers below 2^53, so exact in double.
     const F64 pitch = Set1(dfPitch);
     const F64 chan = Set1(dfChan);
@@ -155,8 +156,9 @@ void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan, const do
     }
 }
 
-void NearestPlaces(double dfPitch, double dfChan, const double* padfCol, const double* padfRow,
-                   const unsigned char* pabyMode, int nPix, std::int64_t* panOffset) {
+VETRA_STAGE void NearestPlaces(double dfPitch, double dfChan, const double* padfCol,
+                               const double* padfRow, const unsigned char* pabyMode, int nPix,
+                               std::int64_t* panOffset) {
     const F64 pitch = Set1(dfPitch);
     const F64 chan = Set1(dfChan);
     for (int i = 0; i < nPix; i += kLanes) {

@@ -145,7 +145,7 @@ void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nS
             oGroup.bNear = true;
             for (int k = 0; k < kLanes; ++k) {
                 oGroup.anOffset[k] = fnFits(i + k) ? fnSrcCol(i + k) - nLeast : 0;
-                oGroup.bNear = oGroup.bNear && oGroup.anOffset[k] < kNearReach;
+                oGroup.bNear = oGroup.bNear && oGroup.anOffset[k] + kNearColumns <= kNearReach;
             }
         }
         mnWidest = std::max(mnWidest, oStrip.nSrcCount);
@@ -172,7 +172,7 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
             return;
         case RowKind::eSums:
             // Per channel the sums of the columns, and those added up.
-            mpadfKept.reset(new double[nChan * 2 * mnRowDoubles]());
+            mpadfKept = MakeAlignedDoubles(nChan * 2 * mnRowDoubles);
             mvpadfRow.resize(nChan);
             for (std::size_t c = 0; c < nChan; ++c) {
                 mvpadfRow[c] = mpadfKept.get() + (2 * c + 1) * mnRowDoubles;
@@ -180,17 +180,17 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
             break;
         case RowKind::eFiltered:
             mnRowDoubles = nStripCols;
-            mpadfSamples.reset(new double[nSamples]());
+            mpadfSamples = MakeAlignedDoubles(nSamples);
             if (oPlan.mpoRows->bTabulated) {
-                mpadfTaps.reset(new double[nStripCols * nWndCols]);
+                mpadfTaps = MakeAlignedDoubles(nStripCols * nWndCols);
             }
             [[fallthrough]];
         default:
-            mpadfKept.reset(new double[nChan * mnRows * mnRowDoubles]());
+            mpadfKept = MakeAlignedDoubles(nChan * mnRows * mnRowDoubles);
             mvnSrcRow.assign(mnRows, -1);
             mvpadfRow.resize(nChan * mnRows);
             if (moMethod.eScratch != Scratch::eNone) {
-                mpadfScratch.reset(new double[GetScratchSize(moMethod)]);
+                mpadfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
             }
             break;
     }

@@ -6,6 +6,7 @@
 #include <memory>
 #include <vector>
 
+#include "vetra/base/utils/resample/engine/aligneddoubles.h"
 #include "vetra/base/utils/resample/engine/columntables.h"
 #include "vetra/base/utils/resample/engine/task.h"
 
@@ -92,10 +93,10 @@ class RowCache {
     std::size_t mnRowDoubles;  // of a kept row
     Strip moStrip;
     RowWindows moWindows{};
-    std::unique_ptr<double[]> mpadfKept;  // [channels][rows]
-    std::unique_ptr<double[]> mpadfSamples;
-    std::unique_ptr<double[]> mpadfTaps;
-    std::unique_ptr<double[]> mpadfScratch;
+    AlignedDoubles mpadfKept;  // [channels][rows]
+    AlignedDoubles mpadfSamples;
+    AlignedDoubles mpadfTaps;
+    AlignedDoubles mpadfScratch;
     std::vector<std::int64_t> mvnSrcRow;  // which is in each slot
     std::vector<const double*> mvpadfRow;
     std::int64_t mnWindowRow = -1;

@@ -13,6 +13,8 @@ namespace vetra::utils::engine {
 constexpr int kSpanPixels = 256;
 /// Pixels that the lane layer treats at once.
 constexpr int kLanes = 8;
+/// Of arrays that are read in whole groups: those then lie in one cache line each.
+constexpr int kAlignment = 64;
 /// Size of a span's arrays: stages may write up to the end of the last group.
 constexpr int kSpanArray = kSpanPixels + kLanes;
 
@@ -61,12 +63,13 @@ struct PickGroup {
     /// Of each column's window, the place of the first sample, counted from nFirst.
     alignas(64) std::int64_t anOffset[kLanes];
     std::int64_t nFirst;
-    bool bNear;  ///< all places are below kNearReach
+    bool bNear;  ///< all places, and the three behind each, are below kNearReach
 };
 constexpr int kNearReach = 16;
+constexpr int kNearColumns = 4;
 
 /// Windows of a stretch of one target row, over rows of doubles. A row has kNearReach doubles more
-/// than the windows need.
+/// than the windows need; filtered rows begin at multiples of kAlignment bytes.
 struct RowWindows {
     const double* const* papdfRow;  ///< of the windows, in order
     int nFirst;                     ///< place of the first pixel in rows that are filtered already

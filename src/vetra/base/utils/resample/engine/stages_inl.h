@@ -9,6 +9,9 @@
 // offers
 //   F64, B64                     eight doubles; eight truth values
 //   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
+//   DivideBy                     division by a Divisor, of numbers that are not tiny
+//   AnyTiny                      whether there are any that DivideBy can't divide: below 2^-511 in
+//                                size, except 0
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
@@ -19,7 +22,8 @@
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
 //   ShufflePairs                 pairs of samples out of sixteen, as a PairGroup says
 //   GatherQuad                   four adjacent samples at eight offsets
-//   GatherNear                   doubles at eight offsets below kNearReach
+//   GatherNear                   doubles at eight offsets and a shift below kNearColumns, together
+//                                below kNearReach
 //   LoadSamples                  eight adjacent samples
 //   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
 //   StoreSamples                 eight values that T can hold (float: rounds to nearest)
@@ -35,10 +39,15 @@
 
 static_assert(FLT_EVAL_METHOD == 0, "double arithmetic must be done in double");
 
+// A stage is one function: with so many of them in a source, compilers stop inlining lane
+// operations at some point.
+#define VETRA_STAGE [[gnu::flatten]]
+
 namespace vetra::utils::engine::VETRA_LEVEL {
 
 namespace {
 
+#include "vetra/base/utils/resample/engine/divisor_inl.h"
 #include VETRA_LANES
 
 // In this order: each uses names of those before it.

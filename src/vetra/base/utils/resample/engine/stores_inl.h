@@ -62,7 +62,8 @@ void StoreInteger64(const double* padfValue, int nPix, const StoreLimits<T>& oLi
 }
 
 template <typename T>
-void StoreValues(const double* padfValue, int nPix, const void* pLimits, void* pSamples) {
+VETRA_STAGE void StoreValues(const double* padfValue, int nPix, const void* pLimits,
+                             void* pSamples) {
     const StoreLimits<T>& oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
     T* p = static_cast<T*>(pSamples);
     if constexpr (kIsFloating<T>) {
@@ -75,7 +76,8 @@ void StoreValues(const double* padfValue, int nPix, const void* pLimits, void* p
 }
 
 template <typename T>
-void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan, void* pTgt) {
+VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
+                            void* pTgt) {
     const T* p = static_cast<const T*>(pSrc);
     T* t = static_cast<T*>(pTgt);
     if (nChan == 1) {
@@ -97,7 +99,7 @@ void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int n
 }
 
 template <typename T>
-void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
+VETRA_STAGE void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
     const StoreLimits<T> oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
     T* p = static_cast<T*>(pSamples);
     for (std::int64_t i = 0; i < nSamples; ++i) {

@@ -6,7 +6,7 @@
 
 // Adds a stretch of one channel of a source row to the sums of its columns, or takes it away.
 template <typename T, bool kAdd>
-void AddRow(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum) {
+VETRA_STAGE void AddRow(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum) {
     const T* p = static_cast<const T*>(pSrc);
     std::int64_t anOffset[kLanes];
     for (int i = 0; i < kLanes; ++i) {
@@ -25,7 +25,7 @@ void AddRow(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum) {
 }
 
 // Sums from the left: padfTotal[n] is that of the first n columns.
-void AddUp(const double* padfSum, std::int64_t nCount, double* padfTotal) {
+VETRA_STAGE void AddUp(const double* padfSum, std::int64_t nCount, double* padfTotal) {
     double dfTotal = 0.0;
     std::int64_t n = 0;
     padfTotal[0] = 0.0;
@@ -47,12 +47,12 @@ void AddUp(const double* padfSum, std::int64_t nCount, double* padfTotal) {
 }
 
 // Means, where the one row of oRows holds the sums from the left.
-void SumValues(const RowWindows& oRows, double* padfValue) {
+VETRA_STAGE void SumValues(const RowWindows& oRows, double* padfValue) {
     const WindowSize& oSize = *static_cast<const WindowSize*>(oRows.pParameters);
-    const F64 count = Set1(static_cast<double>(std::int64_t{oSize.nCols} * oSize.nRows));
+    const Divisor oCount = MakeDivisor(std::int64_t{oSize.nCols} * oSize.nRows);
     const double* padfTotal = oRows.papdfRow[0];
     ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
         const F64 sum = oWindow.Pick(padfTotal, oSize.nCols) - oWindow.Pick(padfTotal, 0);
-        Store(padfValue + i, sum / count);
+        Store(padfValue + i, DivideBy(sum, oCount));
     });
 }

@@ -217,8 +217,14 @@ struct RowReader {
     const PickGroup& oGroup;
 
     F64 Pick(const double* padfRow, int nCol) const {
-        const double* p = padfRow + oGroup.nFirst + nCol;
-        return kNear ? GatherNear(p, oGroup.anOffset) : Gather(p, oGroup.anOffset);
+        const double* p = padfRow + oGroup.nFirst;
+        if constexpr (kNear) {
+            // Four columns come from the same loads.
+            const int nShift = nCol % kNearColumns;
+            return GatherNear(p + (nCol - nShift), oGroup.anOffset, nShift);
+        } else {
+            return Gather(p + nCol, oGroup.anOffset);
+        }
     }
 
     template <int N>
