@@ -22,6 +22,7 @@
 
 #include "vetra/base/utils/resample/engine/aligneddoubles.h"
 #include "vetra/base/utils/resample/engine/columntables.h"
+#include "vetra/base/utils/resample/engine/maskmap.h"
 #include "vetra/base/utils/resample/engine/positions.h"
 #include "vetra/base/utils/resample/engine/rowcache.h"
 #include "vetra/base/utils/resample/engine/task.h"
@@ -53,6 +54,10 @@ struct Span {
     const double* padfFracRow = nullptr;
     const unsigned char* pabyWindowMask = nullptr;
     const PairGroup* poGroups = nullptr;
+    // How the values are made; those of windows with replaced samples, which have a byte of 1 here,
+    // are made once more as the method says.
+    ValuesRow eValues = eVR_NONE;
+    const unsigned char* pabyBroken = nullptr;
     // Has the values of the windows where it isn't null; else they are made of source samples.
     RowCache* poRows = nullptr;
     int nFirstCol = 0;
@@ -72,6 +77,17 @@ struct SpanArrays {
     alignas(64) std::int64_t anWindow[kSpanArray] = {};
     alignas(64) std::int64_t anNearest[kSpanArray] = {};
     alignas(64) unsigned char abyMode[kSpanArray] = {};
+    alignas(64) unsigned char abyBroken[kSpanArray] = {};
+};
+
+// The windows of some pixels of a span, packed.
+struct PackedWindows {
+    int nPix = 0;
+    int anPixel[kSpanArray] = {};
+    alignas(64) std::int64_t anOffset[kSpanArray] = {};
+    alignas(64) double adfFracCol[kSpanArray] = {};
+    alignas(64) double adfFracRow[kSpanArray] = {};
+    alignas(64) double adfValue[kSpanArray] = {};
 };
 
 // Values of the channels of a span that are made at once, and the samples one becomes.
@@ -79,7 +95,7 @@ struct ValueArrays {
     // As many as the values stage may fill at once.
     alignas(64) double adfValue[2 * kSpanArray] = {};
     alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
-    double* padfScratch = nullptr;
+    PackedWindows oBroken;
 };
 
 unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
@@ -88,10 +104,34 @@ unsigned SetOfModes(const unsigned char* pabyMode, int nPix) {
         return 1u << pabyMode[0];
     }
     unsigned nModes = 0;
-    for (int i = 0; i < nPix; ++i) {
-        nModes |= 1u << pabyMode[i];
+    for (int nMode = 0; nMode < 4; ++nMode) {
+        if (std::memchr(pabyMode, nMode, static_cast<std::size_t>(nPix)) != nullptr) {
+            nModes |= 1u << nMode;
+        }
     }
     return nModes;
+}
+
+// Picks the broken windows out of a span.
+void Pack(const Span& oSpan, PackedWindows& oBroken) {
+    int n = 0;
+    const auto fnAdd = [&](int i) {
+        oBroken.anPixel[n] = i;
+        oBroken.anOffset[n] = oSpan.panWindow[i];
+        oBroken.adfFracCol[n] = oSpan.padfFracCol[i];
+        oBroken.adfFracRow[n] = oSpan.padfFracRow[i];
+        ++n;
+    };
+    for (int i = 0; i < oSpan.nPix; ++i) {
+        if (oSpan.pabyBroken[i] != 0 && oSpan.pabyMode[i] == ePO_INTERPOLATED) {
+            fnAdd(i);
+        }
+    }
+    oBroken.nPix = n;
+    // Whole groups are computed.
+    while (n % kLanes != 0) {
+        fnAdd(oBroken.anPixel[n - 1]);
+    }
 }
 
 class Run {
@@ -102,32 +142,49 @@ class Run {
     struct ThreadMemory {
         AlignedDoubles padfScratch;
         std::unique_ptr<RowCache> poRows;
+        std::unique_ptr<MaskMap> poMap;
     };
     ThreadMemory MakeThreadMemory() const;
 
     // Fills target pixels nBegin to nEnd - 1.
     void Walk(long long nBegin, long long nEnd, const ThreadMemory& oMemory) const {
         ValueArrays oValues;
-        oValues.padfScratch = oMemory.padfScratch.get();
-        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd, oValues)
-                                  : WalkRows(nBegin, nEnd, oMemory.poRows.get(), oValues);
+        moColumns.vdfFrac.empty() ? WalkGeneral(nBegin, nEnd, oMemory, oValues)
+                                  : WalkRows(nBegin, nEnd, oMemory, oValues);
     }
 
  private:
-    void WalkGeneral(long long nBegin, long long nEnd, ValueArrays& oValues) const;
-    void Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const;
+    void WalkGeneral(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
+                     ValueArrays& oValues) const;
+    void Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArrays) const;
+    void Place(SpanArrays& oArrays) const;
+    void PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const;
+    bool Provides(MaskMap& oMap, const SpanArrays& oArrays) const;
     // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
     [[gnu::always_inline]] inline void Prefetch(const Span& oSpan) const;
 
-    void WalkRows(long long nBegin, long long nEnd, RowCache* poRows, ValueArrays& oValues) const;
-    void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, RowCache* poRows,
-                 ValueArrays& oValues) const;
+    void WalkRows(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
+                  ValueArrays& oValues) const;
+    void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+                 const ThreadMemory& oMemory, ValueArrays& oValues) const;
 
-    void ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
-                     long long nWindowShift, const std::int64_t* panNearest,
-                     long long nNearestShift, unsigned char* pabyClassThenMode) const;
+    // Of the mask, what the windows of a span see.
+    struct MaskView {
+        const std::uint64_t* panWhole;
+        const std::uint64_t* panUsable;
+        const unsigned char* pabyWindow;
+        const unsigned char* pabyNearest;
+    };
+    MaskWindow GetMaskWindow(const MaskView& oMask) const;
+    unsigned ChooseModes(long long nFirst, int nPix, const MaskView& oMask,
+                         const std::int64_t* panWindow, const std::int64_t* panNearest,
+                         unsigned char* pabyClassThenMode) const;
+    unsigned ApplyRequests(long long nFirst, int nPix, unsigned nModes,
+                           unsigned char* pabyClassThenMode) const;
 
-    void Finish(const Span& oSpan, ValueArrays& oValues) const;
+    void Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oValues) const;
+    void ReplaceBroken(const Span& oSpan, int nChannel, WindowSpan oWindows, PackedWindows& oBroken,
+                       double* padfValue) const;
     void StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
                       unsigned char* pabySample) const;
     void CopyRuns(const Span& oSpan) const;
@@ -148,6 +205,8 @@ class Run {
     Positions moPositions;
     ModeTable moModes;
     ClassLimits moLimits;
+    // Modes by class where every request is 1.
+    unsigned char mabyModeOfClass[4];
     // Neither mask has a say: modes follow from positions alone.
     bool mbOpen;
     // The mode of a pixel whose window doesn't fit but whose nearest pixel is there.
@@ -186,7 +245,10 @@ Run::Run(const Task& oTask)
     moLimits.dfRowOff = oWindow.nRowOff;
 
     const bool bNearest = moMethod.eRule == ModeRule::eNearestSample;
-    mnFallback = moModes.Get(ePO_INTERPOLATED, kClassNear);
+    for (unsigned char nClass = 0; nClass < 4; ++nClass) {
+        mabyModeOfClass[nClass] = moModes.Get(ePO_INTERPOLATED, nClass);
+    }
+    mnFallback = mabyModeOfClass[kClassNear];
     if (oTask.oOptions.bShortcuts) {
         if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
@@ -210,19 +272,24 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
         } else if (moMethod.eScratch != Scratch::eNone) {
             oMemory.padfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
         }
+        if (moTask.oOptions.bShortcuts && moTask.pabySrcMask != nullptr) {
+            oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages);
+        }
     }
     return oMemory;
 }
 
-void Run::WalkGeneral(long long nBegin, long long nEnd, ValueArrays& oValues) const {
+void Run::WalkGeneral(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
+                      ValueArrays& oValues) const {
     SpanArrays oArrays;
     for (long long nFirst = nBegin; nFirst < nEnd; nFirst += kSpanPixels) {
-        Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)), oArrays);
-        Finish(oArrays.oSpan, oValues);
+        Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)),
+                oMemory.poMap.get(), oArrays);
+        Finish(oArrays.oSpan, oMemory, oValues);
     }
 }
 
-void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
+void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArrays) const {
     Span& oSpan = oArrays.oSpan;
     oSpan.nFirst = nFirst;
     oSpan.nPix = nPix;
@@ -234,16 +301,31 @@ void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
     oSpan.panNearest = oArrays.anNearest;
     oSpan.padfFracCol = oArrays.adfFracCol;
     oSpan.padfFracRow = oArrays.adfFracRow;
+    oSpan.eValues = moMethod.eValues;
+    oSpan.pabyBroken = nullptr;
 
     moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
+    if (poMap != nullptr && Provides(*poMap, oArrays)) {
+        PlaceByMap(*poMap, oArrays);
+    } else {
+        Place(oArrays);
+    }
+    Prefetch(oSpan);
+}
+
+// Modes first, then the places of each mode.
+void Run::Place(SpanArrays& oArrays) const {
+    Span& oSpan = oArrays.oSpan;
+    const int nPix = oSpan.nPix;
     if (mbOpen) {
         oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.eValues != eVR_NONE, mnFallback,
                                              oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
     } else {
         moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
                             oArrays.abyMode, oArrays.anWindow, oArrays.anNearest);
-        ChooseModes(nFirst, nPix, oArrays.anWindow, 0, oArrays.anNearest, 0, oArrays.abyMode);
-        oSpan.nModes = SetOfModes(oArrays.abyMode, nPix);
+        oSpan.nModes = ChooseModes(oSpan.nFirst, nPix,
+                                   {nullptr, nullptr, moTask.pabySrcMask, moTask.pabySrcMask},
+                                   oArrays.anWindow, oArrays.anNearest, oArrays.abyMode);
     }
     if ((oSpan.nModes & kSetInterpolated) != 0) {
         moStages.pfnWindows(moLimits, static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
@@ -255,7 +337,46 @@ void Run::Prepare(long long nFirst, int nPix, SpanArrays& oArrays) const {
                                   oArrays.adfRow, oSpan.ModesUnless(kSetNearest), nPix,
                                   oArrays.anNearest);
     }
-    Prefetch(oSpan);
+}
+
+// All at once.
+void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
+    Span& oSpan = oArrays.oSpan;
+    const bool bReplacing = moMethod.eRule == ModeRule::eReplacingWindow;
+    MaskView oMask{};
+    oMask.panWhole = oMap.GetWhole(0);
+    oMask.panUsable = oMap.GetUsable(0);
+    oSpan.nModes = moStages.pfnMappedPlaces(
+        moLimits, GetMaskWindow(oMask), oMap.GetPitch(), static_cast<double>(mnPitch), moTask.nChan,
+        oArrays.adfCol, oArrays.adfRow, oSpan.nPix,
+        {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr, oArrays.anWindow,
+         oArrays.anNearest, oArrays.adfFracCol, oArrays.adfFracRow});
+    oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, oSpan.nModes, oArrays.abyMode);
+    if (bReplacing) {
+        oSpan.eValues = PlainRow(moMethod);
+        oSpan.pabyBroken = oArrays.abyBroken;
+    }
+}
+
+// Makes the bits of a span's windows and nearest pixels. Neither begins farther from a position
+// than a pixel beyond the window's offset.
+bool Run::Provides(MaskMap& oMap, const SpanArrays& oArrays) const {
+    const PositionBounds oBounds =
+        moStages.pfnBounds(oArrays.adfCol, oArrays.adfRow, oArrays.oSpan.nPix);
+    const auto fnReach = [](double dfFirst, double dfLast, double dfOff, int nSize) {
+        const double dfEnd = nSize - 1.0;
+        Reach oReach;
+        if (dfFirst <= dfLast) {
+            const double dfLow = std::floor(dfFirst) + std::min(dfOff, 0.0);
+            const double dfHigh = std::floor(dfLast) + 1.0 + std::max(dfOff, 0.0);
+            oReach.Add(static_cast<std::int64_t>(std::clamp(dfLow, 0.0, dfEnd)));
+            oReach.Add(static_cast<std::int64_t>(std::clamp(dfHigh, 0.0, dfEnd)));
+        }
+        return oReach;
+    };
+    return oMap.Provide(
+        fnReach(oBounds.dfFirstCol, oBounds.dfLastCol, moLimits.dfColOff, moTask.nSrcCols),
+        fnReach(oBounds.dfFirstRow, oBounds.dfLastRow, moLimits.dfRowOff, moTask.nSrcRows));
 }
 
 // Asks for the source rows that the next target rows will need. A target row crosses many source
@@ -282,37 +403,56 @@ void Run::Prefetch(const Span& oSpan) const {
     }
 }
 
-// Turns classes into modes. The shifts lead from the indices to source pixels.
-void Run::ChooseModes(long long nFirst, int nPix, const std::int64_t* panWindow,
-                      long long nWindowShift, const std::int64_t* panNearest,
-                      long long nNearestShift, unsigned char* pabyClassThenMode) const {
+MaskWindow Run::GetMaskWindow(const MaskView& oMask) const {
+    // The other rules look at the nearest pixel alone, whose byte only has to differ from 0.
+    const bool bWholeWindow = moMethod.eRule == ModeRule::eWindow;
+    return {oMask.panWhole,
+            oMask.panUsable,
+            oMask.pabyWindow,
+            oMask.pabyNearest,
+            moTask.nSrcCols,
+            moMethod.oWindow.nCols,
+            bWholeWindow ? moMethod.oWindow.nRows : 0,
+            bWholeWindow,
+            moTask.pabyTgtMask == nullptr ? mabyModeOfClass : nullptr};
+}
+
+// Turns classes into modes. Returns the set of modes.
+unsigned Run::ChooseModes(long long nFirst, int nPix, const MaskView& oMask,
+                          const std::int64_t* panWindow, const std::int64_t* panNearest,
+                          unsigned char* pabyClassThenMode) const {
+    unsigned nModes = 0;
     if (moTask.pabySrcMask != nullptr) {
-        const Window& oWindow = moMethod.oWindow;
-        // The other rules look at the nearest pixel alone, whose byte only has to differ from 0.
-        const bool bWholeWindow = moMethod.eRule == ModeRule::eWindow;
-        moStages.pfnMaskClasses(
-            {moTask.pabySrcMask + nWindowShift, moTask.pabySrcMask + nNearestShift, moTask.nSrcCols,
-             oWindow.nCols, bWholeWindow ? oWindow.nRows : 0, bWholeWindow},
-            panWindow, panNearest, nPix, pabyClassThenMode);
+        nModes = moStages.pfnMaskClasses(GetMaskWindow(oMask), panWindow, panNearest, nPix,
+                                         pabyClassThenMode);
     }
-    // A copy that no store can reach, so that it needs no reading again.
-    const ModeTable oModes = moModes;
-    const unsigned char* pabyRequest =
-        moTask.pabyTgtMask == nullptr ? nullptr : moTask.pabyTgtMask + nFirst;
-    for (int i = 0; i < nPix; ++i) {
-        const unsigned char nRequest =
-            pabyRequest == nullptr ? static_cast<unsigned char>(ePO_INTERPOLATED) : pabyRequest[i];
-        pabyClassThenMode[i] = oModes.Get(nRequest, pabyClassThenMode[i]);
+    return ApplyRequests(nFirst, nPix, nModes, pabyClassThenMode);
+}
+
+// Modes of classes by the target mask; without one they are modes already.
+unsigned Run::ApplyRequests(long long nFirst, int nPix, unsigned nModes,
+                            unsigned char* pabyClassThenMode) const {
+    if (moTask.pabyTgtMask != nullptr) {
+        // A copy that no store can reach, so that it needs no reading again.
+        const ModeTable oModes = moModes;
+        const unsigned char* pabyRequest = moTask.pabyTgtMask + nFirst;
+        for (int i = 0; i < nPix; ++i) {
+            pabyClassThenMode[i] = oModes.Get(pabyRequest[i], pabyClassThenMode[i]);
+        }
+        nModes = SetOfModes(pabyClassThenMode, nPix);
     }
     // The group of the last pixel holds classes of pixels that don't exist.
     for (int i = nPix; i % kLanes != 0; ++i) {
         pabyClassThenMode[i] = pabyClassThenMode[nPix - 1];
     }
+    return nModes;
 }
 
-void Run::WalkRows(long long nBegin, long long nEnd, RowCache* poRows, ValueArrays& oValues) const {
+void Run::WalkRows(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
+                   ValueArrays& oValues) const {
     const int nCols = moTask.nTgtCols;
-    const std::vector<Strip> voWhole = {{0, nCols, 0, 0}};
+    const std::vector<Strip> voWhole = {{0, nCols}};
+    RowCache* poRows = oMemory.poRows.get();
     for (const Strip& oStrip : poRows != nullptr ? moRowPlan.GetStrips() : voWhole) {
         if (poRows != nullptr) {
             poRows->SetStrip(oStrip);
@@ -329,14 +469,14 @@ void Run::WalkRows(long long nBegin, long long nEnd, RowCache* poRows, ValueArra
             double dfRow = 0.0;
             moTask.poTfm->GetSrcPos(nFirst, dfCol, dfRow);
             FillRow(dfRow, nFirst, static_cast<int>(nFirst % nCols),
-                    static_cast<int>(nLast - nFirst), poRows, oValues);
+                    static_cast<int>(nLast - nFirst), oMemory, oValues);
         }
     }
 }
 
 // Fills a stretch of one target row.
-void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, RowCache* poRows,
-                  ValueArrays& oValues) const {
+void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
+                  const ThreadMemory& oMemory, ValueArrays& oValues) const {
     const double dfNearRow = std::floor(dfRow + 0.5);
     const double dfAnchorRow = moLimits.bAnchorNearest ? dfNearRow : std::floor(dfRow);
     const double dfFracRow = dfRow - dfAnchorRow;
@@ -350,17 +490,33 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, R
     double adfFracRow[kSpanArray];
     std::fill_n(adfFracRow, std::min(nNumCols, kSpanPixels) + kLanes, dfFracRow);
     oSpan.padfFracRow = adfFracRow;
+    oSpan.eValues = moMethod.eValues;
     // Rows outside have no samples: no pixel of theirs has a mode that reads any.
     const long long nWindowRow =
         bFits ? static_cast<long long>(dfAnchorRow) + moMethod.oWindow.nRowOff : 0;
     const long long nNearestRow = bNear ? static_cast<long long>(dfNearRow) : 0;
     oSpan.pWindowSrc = SrcRow(nWindowRow);
     oSpan.pNearestSrc = SrcRow(nNearestRow);
+    MaskView oMask{};
     if (moTask.pabySrcMask != nullptr) {
         oSpan.pabyWindowMask = moTask.pabySrcMask + nWindowRow * moTask.nSrcCols;
+        oMask.pabyWindow = oSpan.pabyWindowMask;
+        oMask.pabyNearest = moTask.pabySrcMask + nNearestRow * moTask.nSrcCols;
+        Reach oRows;
+        oRows.Add(nWindowRow);
+        oRows.Add(nNearestRow);
+        if (oMemory.poMap != nullptr && oMemory.poMap->Provide(moColumns.oReach, oRows)) {
+            oMask.panWhole = oMemory.poMap->GetWhole(nWindowRow);
+            oMask.panUsable = oMemory.poMap->GetUsable(nNearestRow);
+        }
     }
+    // Rows know nothing of replaced samples.
+    const bool bReplacing =
+        moMethod.eRule == ModeRule::eReplacingWindow && moTask.pabySrcMask != nullptr;
+    RowCache* poRows = bReplacing && oMask.panWhole == nullptr ? nullptr : oMemory.poRows.get();
     bool bFetched = false;
     alignas(64) unsigned char abyMode[kSpanArray];
+    alignas(64) unsigned char abyBroken[kSpanArray];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
         const std::size_t nCol = static_cast<std::size_t>(nFirstCol + nDone);
         oSpan.nFirst = nFirst + nDone;
@@ -373,17 +529,23 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, R
                              : moColumns.voGroups.data() + nCol / kLanes;
         if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
+            oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
         } else {
             const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
             for (int i = 0; i < kSpanPixels; ++i) {
                 abyMode[i] = pabyClass[i] & nRowClass;
             }
-            ChooseModes(oSpan.nFirst, oSpan.nPix, moColumns.vnWindowCol.data() + nCol,
-                        nWindowRow * moTask.nSrcCols, moColumns.vnNearestCol.data() + nCol,
-                        nNearestRow * moTask.nSrcCols, abyMode);
+            const std::int64_t* panWindow = moColumns.vnWindowCol.data() + nCol;
+            oSpan.nModes = ChooseModes(oSpan.nFirst, oSpan.nPix, oMask, panWindow,
+                                       moColumns.vnNearestCol.data() + nCol, abyMode);
             oSpan.pabyMode = abyMode;
+            if (bReplacing && oMask.panWhole != nullptr) {
+                moStages.pfnBrokenWindows(oMask.panWhole, panWindow, abyMode, oSpan.nPix,
+                                          abyBroken);
+                oSpan.eValues = PlainRow(moMethod);
+                oSpan.pabyBroken = abyBroken;
+            }
         }
-        oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
         if (poRows != nullptr && (oSpan.nModes & kSetInterpolated) != 0) {
             if (!bFetched) {
                 poRows->SetWindowRow(nWindowRow, dfFracRow);
@@ -392,12 +554,12 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols, R
             oSpan.poRows = poRows;
             oSpan.nFirstCol = nFirstCol + nDone;
         }
-        Finish(oSpan, oValues);
+        Finish(oSpan, oMemory, oValues);
     }
 }
 
 // The last stages: values and store.
-void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
+void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oValues) const {
     if (moTask.oOptions.pabyOutcome != nullptr) {
         std::memcpy(moTask.oOptions.pabyOutcome + oSpan.nFirst, oSpan.pabyMode,
                     static_cast<std::size_t>(oSpan.nPix));
@@ -425,18 +587,41 @@ void Run::Finish(const Span& oSpan, ValueArrays& oValues) const {
     oWindows.pabyMask = oSpan.pabyWindowMask;
     oWindows.poGroups = oSpan.poGroups;
     oWindows.pParameters = moTask.pParameters;
-    oWindows.padfScratch = oValues.padfScratch;
+    oWindows.padfScratch = oMemory.padfScratch.get();
+    PackedWindows& oBroken = oValues.oBroken;
+    if (oSpan.pabyBroken != nullptr) {
+        Pack(oSpan, oBroken);
+    }
     for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
         double* padfValue = oValues.adfValue;
         if (bWindows && oSpan.poRows != nullptr) {
             padfValue = oSpan.poRows->GetValues(nChannel, oSpan.nFirstCol, oSpan.nPix);
         } else if (bWindows) {
-            moStages.apfnValues[moMethod.eValues][moTask.nSrcType](
+            moStages.apfnValues[oSpan.eValues][moTask.nSrcType](
                 oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes, padfValue);
+        }
+        if (oSpan.pabyBroken != nullptr && oBroken.nPix != 0) {
+            ReplaceBroken(oSpan, nChannel, oWindows, oBroken, padfValue);
         }
         for (int i = 0; i < moMethod.nChannels; ++i) {
             StoreChannel(oSpan, nChannel + i, padfValue + i * kSpanArray, oValues.abySample);
         }
+    }
+}
+
+// Makes the values of broken windows.
+void Run::ReplaceBroken(const Span& oSpan, int nChannel, WindowSpan oWindows,
+                        PackedWindows& oBroken, double* padfValue) const {
+    oWindows.panOffset = oBroken.anOffset;
+    oWindows.padfFracCol = oBroken.adfFracCol;
+    oWindows.padfFracRow = oBroken.adfFracRow;
+    oWindows.pabyMode = nullptr;
+    oWindows.poGroups = nullptr;
+    oWindows.nPix = oBroken.nPix;
+    moStages.apfnValues[moMethod.eValues][moTask.nSrcType](
+        oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes, oBroken.adfValue);
+    for (int i = 0; i < oBroken.nPix; ++i) {
+        padfValue[oBroken.anPixel[i]] = oBroken.adfValue[i];
     }
 }
 

@@ -85,6 +85,15 @@ inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
             _mm256_castsi256_pd(_mm256_cvtepi8_epi64(_mm_srli_si128(v, 4)))};
 }
 
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    const auto fnHalf = [&](const unsigned char* q) {
+        const __m256i v = _mm256_loadu_si256(reinterpret_cast<const __m256i*>(q));
+        return static_cast<unsigned>(_mm256_movemask_epi8(
+            _mm256_cmpeq_epi8(v, _mm256_set1_epi8(static_cast<char>(nValue)))));
+    };
+    return std::uint64_t{fnHalf(p + 32)} << 32 | fnHalf(p);
+}
+
 inline F64 FromInt32(__m256i v) {
     return {_mm256_cvtepi32_pd(_mm256_castsi256_si128(v)),
             _mm256_cvtepi32_pd(_mm256_extracti128_si256(v, 1))};

@@ -59,6 +59,11 @@ inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
     return {static_cast<__mmask8>(m)};
 }
 
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    return _mm512_cmpeq_epi8_mask(_mm512_loadu_si512(p),
+                                  _mm512_set1_epi8(static_cast<char>(nValue)));
+}
+
 inline F64 FromInt32(__m256i v) { return {_mm512_cvtepi32_pd(v)}; }
 inline F64 FromFloat(__m256 v) { return {_mm512_cvtps_pd(v)}; }
 inline F64 FromHalves(__m256d lo, __m256d hi) {

@@ -195,6 +195,13 @@ inline void StoreSamples(T* p, F64 a) {
     }
 }
 
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    std::uint64_t nBits = 0;
+    for (int i = 0; i < 64; ++i) {
+        nBits |= std::uint64_t{p[i] == nValue} << i;
+    }
+    return nBits;
+}
 inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
                          unsigned char nValue) {
     unsigned nBits = 0;

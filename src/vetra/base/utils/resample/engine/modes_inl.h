@@ -60,12 +60,14 @@ inline F64 Anchor(const ClassLimits& oLimits, F64 pos) {
     return oLimits.bAnchorNearest ? Nearest(pos) : Floor(pos);
 }
 
-VETRA_STAGE void Classes(const ClassLimits& oClassLimits, int nSrcCols, const double* padfCol,
-                         const double* padfRow, int nPix, unsigned char* pabyClass,
-                         std::int64_t* panWindow, std::int64_t* panNearest) {
+VETRA_STAGE void Classes(const ClassLimits& oClassLimits, std::int64_t nPitch,
+                         const double* padfCol, const double* padfRow, int nPix,
+                         unsigned char* pabyClass, std::int64_t* panWindow,
+                         std::int64_t* panNearest) {
     const Limits oLimits(oClassLimits);
-    const F64 pitch = Set1(nSrcCols);
-    const F64 first = Set1(oClassLimits.dfRowOff * nSrcCols + oClassLimits.dfColOff);
+    const double dfPitch = static_cast<double>(nPitch);
+    const F64 pitch = Set1(dfPitch);
+    const F64 first = Set1(oClassLimits.dfRowOff * dfPitch + oClassLimits.dfColOff);
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
@@ -78,34 +80,223 @@ VETRA_STAGE void Classes(const ClassLimits& oClassLimits, int nSrcCols, const do
     }
 }
 
-VETRA_STAGE void MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                             const std::int64_t* panNearest, int nPix, unsigned char* pabyClass) {
+inline F64 Least(F64 a, F64 b) { return Select(a < b, a, b); }
+inline double LeastOf(F64 a) {
+    double adf[kLanes];
+    Store(adf, a);
+    for (int i = 1; i < kLanes; ++i) {
+        adf[0] = adf[i] < adf[0] ? adf[i] : adf[0];
+    }
+    return adf[0];
+}
+
+VETRA_STAGE PositionBounds Bounds(const double* padfCol, const double* padfRow, int nPix) {
+    F64 firstCol = Set1(__builtin_inf());
+    F64 firstRow = firstCol;
+    // With their signs changed.
+    F64 lastCol = firstCol;
+    F64 lastRow = firstCol;
+    const F64 zero = Set1(0.0);
+    for (int i = 0; i + kLanes <= nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        firstCol = Least(col, firstCol);
+        firstRow = Least(row, firstRow);
+        lastCol = Least(zero - col, lastCol);
+        lastRow = Least(zero - row, lastRow);
+    }
+    PositionBounds o{LeastOf(firstCol), -LeastOf(lastCol), LeastOf(firstRow), -LeastOf(lastRow)};
+    for (int i = nPix / kLanes * kLanes; i < nPix; ++i) {
+        o.dfFirstCol = padfCol[i] < o.dfFirstCol ? padfCol[i] : o.dfFirstCol;
+        o.dfLastCol = padfCol[i] > o.dfLastCol ? padfCol[i] : o.dfLastCol;
+        o.dfFirstRow = padfRow[i] < o.dfFirstRow ? padfRow[i] : o.dfFirstRow;
+        o.dfLastRow = padfRow[i] > o.dfLastRow ? padfRow[i] : o.dfLastRow;
+    }
+    return o;
+}
+
+// Bits of eight numbers, set where a map has a bit at that number.
+inline unsigned MapBits(const std::uint64_t* panBits, const std::int64_t* panPlace) {
+    std::uint64_t nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        const std::int64_t n = panPlace[i];
+        nBits |= (panBits[n >> 6] >> (n & 63) & 1u) << i;
+    }
+    return static_cast<unsigned>(nBits);
+}
+inline unsigned MapBits(const std::uint64_t* panBits, F64 place) {
+    std::int64_t anPlace[kLanes];
+    StoreIntegers(anPlace, place);
+    return MapBits(panBits, anPlace);
+}
+
+// Which of the windows of eight pixels hold no mask byte of 0.
+inline unsigned WholeBits(const MaskWindow& oWindow, const std::int64_t* panWindow) {
+    if (oWindow.panWhole != nullptr) {
+        return MapBits(oWindow.panWhole, panWindow);
+    }
+    unsigned nWhole = 0xff;
+    const unsigned char* pabyRow = oWindow.pabyWindow;
+    for (int nRow = 0; nRow < oWindow.nWndRows; ++nRow, pabyRow += oWindow.nSrcCols) {
+        int nCol = 0;
+        for (; nCol + 1 < oWindow.nWndCols; nCol += 2) {
+            nWhole &= FullPairBits(pabyRow + nCol, panWindow);
+        }
+        if (nCol < oWindow.nWndCols) {
+            nWhole &= ~ByteBits(pabyRow + nCol, panWindow, 0);
+        }
+    }
+    return nWhole;
+}
+
+// Which of the nearest pixels of eight pixels may be used.
+inline unsigned UsableBits(const MaskWindow& oWindow, const std::int64_t* panNearest) {
+    if (oWindow.panUsable != nullptr) {
+        return MapBits(oWindow.panUsable, panNearest);
+    }
+    return oWindow.bExactlyOne ? ByteBits(oWindow.pabyNearest, panNearest, 1)
+                               : ~ByteBits(oWindow.pabyNearest, panNearest, 0);
+}
+
+// Writes what becomes of groups of eight pixels, as bits, and keeps the set of it.
+struct ClassWriter {
+    ClassWriter(const MaskWindow& oWindow, int nNumPix) : nPix(nNumPix) {
+        unsigned char abyWritten[4] = {0, 1, 2, 3};
+        if (oWindow.pabyModeOfClass != nullptr) {
+            __builtin_memcpy(abyWritten, oWindow.pabyModeOfClass, sizeof abyWritten);
+        }
+        for (int k = 0; k < 4; ++k) {
+            anBit0[k] = (abyWritten[k] & 1) != 0 ? 0xffu : 0u;
+            anBit1[k] = (abyWritten[k] & 2) != 0 ? 0xffu : 0u;
+        }
+        bNearestDecides = abyWritten[kClassFits] != abyWritten[kClassFits | kClassNear];
+    }
+
+    void Write(int i, unsigned nFits, unsigned nNear, unsigned char* p) {
+        const unsigned anOfClass[4] = {~nFits & ~nNear, nFits & ~nNear, ~nFits & nNear,
+                                       nFits & nNear};
+        unsigned nBit0 = 0;
+        unsigned nBit1 = 0;
+        for (int k = 0; k < 4; ++k) {
+            nBit0 |= anOfClass[k] & anBit0[k];
+            nBit1 |= anOfClass[k] & anBit1[k];
+        }
+        StoreBits(p + i, nBit0, nBit1);
+        const unsigned nExist = nPix - i < kLanes ? (1u << (nPix - i)) - 1u : 0xffu;
+        anFound[0] |= ~nBit0 & ~nBit1 & nExist;
+        anFound[1] |= nBit0 & ~nBit1 & nExist;
+        anFound[2] |= ~nBit0 & nBit1 & nExist;
+        anFound[3] |= nBit0 & nBit1 & nExist;
+    }
+
+    unsigned GetSet() const {
+        unsigned nSet = 0;
+        for (int k = 0; k < 4; ++k) {
+            nSet |= anFound[k] != 0 ? 1u << k : 0u;
+        }
+        return nSet;
+    }
+
+    int nPix;
+    // Which classes have the bits 0 and 1 of what is written.
+    unsigned anBit0[4];
+    unsigned anBit1[4];
+    bool bNearestDecides;  // about pixels whose windows are whole
+    unsigned anFound[4] = {};
+};
+
+VETRA_STAGE unsigned MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                                 const std::int64_t* panNearest, int nPix,
+                                 unsigned char* pabyClassThenMode) {
+    ClassWriter oWriter(oWindow, nPix);
     for (int i = 0; i < nPix; i += kLanes) {
-        unsigned char* pabyGroup = pabyClass + i;
+        const unsigned char* pabyGroup = pabyClassThenMode + i;
+        const unsigned nBoth = Bits(BytesEqual(pabyGroup, kClassFits | kClassNear));
+        unsigned nFits = nBoth | Bits(BytesEqual(pabyGroup, kClassFits));
+        unsigned nNear = nBoth | Bits(BytesEqual(pabyGroup, kClassNear));
         // Where nothing fits the source may be smaller than a window.
-        unsigned nFull = 0;
-        if (AnyByteEquals(pabyGroup, kClassFits) ||
-            AnyByteEquals(pabyGroup, kClassFits | kClassNear)) {
-            nFull = 0xff;
-            const unsigned char* pabyRow = oWindow.pabyWindow;
-            for (int nRow = 0; nRow < oWindow.nWndRows; ++nRow, pabyRow += oWindow.nSrcCols) {
-                int nCol = 0;
-                for (; nCol + 1 < oWindow.nWndCols; nCol += 2) {
-                    nFull &= FullPairBits(pabyRow + nCol, panWindow + i);
-                }
-                if (nCol < oWindow.nWndCols) {
-                    nFull &= ~ByteBits(pabyRow + nCol, panWindow + i, 0);
-                }
+        if (oWindow.nWndRows != 0 && nFits != 0) {
+            nFits &= WholeBits(oWindow, panWindow + i);
+        }
+        if (nFits != 0xff || oWriter.bNearestDecides) {
+            nNear &= UsableBits(oWindow, panNearest + i);
+        }
+        oWriter.Write(i, nFits, nNear, pabyClassThenMode);
+    }
+    return oWriter.GetSet();
+}
+
+VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWindow& oWindow,
+                                  std::int64_t nBitPitch, double dfPitch, double dfChan,
+                                  const double* padfCol, const double* padfRow, int nPix,
+                                  const SpanPlaces& oPlaces) {
+    const Limits oLimits(oClassLimits);
+    ClassWriter oWriter(oWindow, nPix);
+    const double dfBitPitch = static_cast<double>(nBitPitch);
+    const F64 bitPitch = Set1(dfBitPitch);
+    const F64 pitch = Set1(dfPitch);
+    const F64 chan = Set1(dfChan);
+    const F64 firstBit = Set1(oClassLimits.dfRowOff * dfBitPitch + oClassLimits.dfColOff);
+    const F64 first = Set1(oClassLimits.dfRowOff * dfPitch + oClassLimits.dfColOff * dfChan);
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        const B64 fit = oLimits.Fit(col, row);
+        unsigned nFits = Bits(fit);
+        if (nFits != 0) {
+            const F64 anchorCol = Anchor(oClassLimits, col);
+            const F64 anchorRow = Anchor(oClassLimits, row);
+            StorePlaces(oPlaces.panWindow + i, fit, anchorRow * pitch + anchorCol * chan + first);
+            Store(oPlaces.padfFracCol + i, col - anchorCol);
+            Store(oPlaces.padfFracRow + i, row - anchorRow);
+            const unsigned nWhole =
+                MapBits(oWindow.panWhole,
+                        Select(fit, anchorRow * bitPitch + anchorCol + firstBit, Set1(0.0)));
+            if (oPlaces.pabyBroken != nullptr) {
+                StoreBits(oPlaces.pabyBroken + i, nFits & ~nWhole, 0);
+            }
+            if (oWindow.nWndRows != 0) {
+                nFits &= nWhole;
+            }
+        } else {
+            StoreIntegers(oPlaces.panWindow + i, Set1(0.0));
+            if (oPlaces.pabyBroken != nullptr) {
+                StoreBits(oPlaces.pabyBroken + i, 0, 0);
             }
         }
-        const unsigned nUsable = oWindow.bExactlyOne
-                                     ? ByteBits(oWindow.pabyNearest, panNearest + i, 1)
-                                     : ~ByteBits(oWindow.pabyNearest, panNearest + i, 0);
-        unsigned char abyKeep[kLanes];
-        StoreBits(abyKeep, nFull & 0xffu, nUsable & 0xffu);
-        for (int k = 0; k < kLanes; ++k) {
-            pabyGroup[k] &= abyKeep[k];
+        unsigned nNear = 0;
+        if (nFits != 0xff || oWriter.bNearestDecides) {
+            const B64 near = oLimits.Near(col, row);
+            const F64 nearCol = Nearest(col);
+            const F64 nearRow = Nearest(row);
+            StorePlaces(oPlaces.panNearest + i, near, nearRow * pitch + nearCol * chan);
+            nNear = Bits(near) & MapBits(oWindow.panUsable,
+                                         Select(near, nearRow * bitPitch + nearCol, Set1(0.0)));
         }
+        oWriter.Write(i, nFits, nNear, oPlaces.pabyClassThenMode);
+    }
+    return oWriter.GetSet();
+}
+
+VETRA_STAGE void MaskBits(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
+                          bool bEqual, std::uint64_t* panBits) {
+    const std::uint64_t nFlip = bEqual ? 0 : ~std::uint64_t{0};
+    std::int64_t n = 0;
+    for (; n + 64 <= nCount; n += 64) {
+        *panBits++ = EqualBits(pabyMask + n, nValue) ^ nFlip;
+    }
+    if (n < nCount) {
+        unsigned char aby[64] = {};
+        __builtin_memcpy(aby, pabyMask + n, static_cast<std::size_t>(nCount - n));
+        *panBits = (EqualBits(aby, nValue) ^ nFlip) & ((std::uint64_t{1} << (nCount - n)) - 1);
+    }
+}
+
+VETRA_STAGE void BrokenWindows(const std::uint64_t* panWhole, const std::int64_t* panWindow,
+                               const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken) {
+    for (int i = 0; i < nPix; i += kLanes) {
+        const unsigned nMode = Bits(BytesEqual(pabyMode + i, 1));
+        StoreBits(pabyBroken + i, nMode != 0 ? nMode & ~MapBits(panWhole, panWindow + i) : 0u, 0);
     }
 }
 

@@ -17,11 +17,10 @@ constexpr double kMostBytes = 64.0 * 1024 * 1024;
 // Source columns per target column beyond which rows hold too much that nobody reads.
 constexpr int kMostReduction = 8;
 
-// The row of the table that computes a method from rows of doubles.
-int RowIndex(const Task& oTask) {
-    const int nIndex = oTask.poMethod->eValues / 2;
-    // Without a mask there is nothing to replace.
-    return nIndex == eVR_CUBICPS / 2 && oTask.pabySrcMask == nullptr ? eVR_CUBIC / 2 : nIndex;
+// The row of the table that computes a method from rows of doubles. Where samples are replaced,
+// which depends on the pixel, only the windows without any come from rows.
+int RowIndex(const Method& oMethod) {
+    return (oMethod.eRule == ModeRule::eReplacingWindow ? PlainRow(oMethod) : oMethod.eValues) / 2;
 }
 
 }  // namespace
@@ -32,7 +31,7 @@ RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTabl
         return;
     }
     mpoStages = &oStages;
-    mpoRows = &oStages.aoRows[RowIndex(oTask)];
+    mpoRows = &oStages.aoRows[RowIndex(oMethod)];
     mbSquared = oMethod.eValues % 2 == 1;
     mpadfFracCol = oColumns.vdfFrac.data();
     for (int nCols = kWidestStrip; nCols >= kSpanPixels; nCols /= 2) {

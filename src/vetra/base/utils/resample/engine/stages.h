@@ -40,14 +40,40 @@ struct ClassLimits {
     double dfRowOff;
 };
 
+/// Least and greatest columns and rows of some positions. Of none, the first is behind the last.
+struct PositionBounds {
+    double dfFirstCol;
+    double dfLastCol;
+    double dfFirstRow;
+    double dfLastRow;
+};
+
 /// The source mask, as a run's windows see it.
 struct MaskWindow {
+    /// A bit for each window, set where it is whole, and one for each nearest pixel, set where it
+    /// may be used; or null, and the bytes are looked at.
+    const std::uint64_t* panWhole;
+    const std::uint64_t* panUsable;
     const unsigned char* pabyWindow;
     const unsigned char* pabyNearest;
     int nSrcCols;
     int nWndCols;
-    int nWndRows;
+    int nWndRows;  ///< 0 where it doesn't matter whether windows are whole
     bool bExactlyOne;
+    /// The mode of each class, where they are the same for all pixels; or null, and what comes out
+    /// are classes.
+    const unsigned char* pabyModeOfClass;
+};
+
+/// Of each pixel of a span what becomes of it, and the places of its window and nearest pixel.
+struct SpanPlaces {
+    unsigned char* pabyClassThenMode;
+    /// 1 for pixels whose windows fit but aren't whole, else 0. May be null.
+    unsigned char* pabyBroken;
+    std::int64_t* panWindow;
+    std::int64_t* panNearest;
+    double* padfFracCol;
+    double* padfFracRow;
 };
 
 /// Corner positions of a bilinear transform, and its size.
@@ -243,15 +269,32 @@ struct LevelStages {
 
     // Modes.
     /// Class bits of each position, and the source pixels at which its window and its nearest pixel
-    /// stand: their indices, with nSrcCols pixels in a row, or 0 where they are outside.
-    void (*pfnClasses)(const ClassLimits& oLimits, int nSrcCols, const double* padfCol,
+    /// stand: their indices, with nPitch entries in a row, or 0 where they are outside.
+    void (*pfnClasses)(const ClassLimits& oLimits, std::int64_t nPitch, const double* padfCol,
                        const double* padfRow, int nPix, unsigned char* pabyClass,
                        std::int64_t* panWindow, std::int64_t* panNearest);
     /// Takes masked pixels out of the classes: the window bit where the window holds a mask byte of
     /// 0, the nearest bit where that pixel's byte is 0 (bExactlyOne: is not 1). The masks are
     /// those of the window and of the nearest pixel to which an index of 0 leads.
-    void (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                           const std::int64_t* panNearest, int nPix, unsigned char* pabyClass);
+    /// Returns the set of what it wrote (1 << class or mode).
+    unsigned (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                               const std::int64_t* panNearest, int nPix,
+                               unsigned char* pabyClassThenMode);
+    /// Bits of nCount mask bytes, set where they are nValue (bEqual) or aren't; and zeros up to a
+    /// whole word.
+    void (*pfnMaskBits)(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
+                        bool bEqual, std::uint64_t* panBits);
+    PositionBounds (*pfnBounds)(const double* padfCol, const double* padfRow, int nPix);
+    /// Classes or modes, where bits of the mask are known, and places: as pfnClasses,
+    /// pfnMaskClasses, pfnWindows and pfnNearestPlaces, but places are given for all windows that
+    /// fit, and nearest ones only in groups in which the class of one pixel depends on it.
+    unsigned (*pfnMappedPlaces)(const ClassLimits& oLimits, const MaskWindow& oWindow,
+                                std::int64_t nBitPitch, double dfPitch, double dfChan,
+                                const double* padfCol, const double* padfRow, int nPix,
+                                const SpanPlaces& oPlaces);
+    /// Writes 1 for those of nPix pixels whose mode is 1 and whose windows aren't whole, else 0.
+    void (*pfnBrokenWindows)(const std::uint64_t* panWhole, const std::int64_t* panWindow,
+                             const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
     /// of modes (1 << mode).

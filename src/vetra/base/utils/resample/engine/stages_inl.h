@@ -18,6 +18,7 @@
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
+//   EqualBits                    bits: which of 64 bytes have a value
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
 //   ShufflePairs                 pairs of samples out of sixteen, as a PairGroup says
@@ -116,6 +117,10 @@ const LevelStages kStages = {
     &BilinearPositions,
     &Classes,
     &MaskClasses,
+    &MaskBits,
+    &Bounds,
+    &MappedPlaces,
+    &BrokenWindows,
     &OpenModes,
     &Windows,
     &NearestPlaces,

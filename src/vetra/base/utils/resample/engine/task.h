@@ -29,6 +29,11 @@ struct Method {
     Scratch eScratch = Scratch::eNone;
 };
 
+/// The row of values for those windows of a replacing method that hold no masked pixel.
+inline ValuesRow PlainRow(const Method& oMethod) {
+    return oMethod.eValues == eVR_SQCUBICPS ? eVR_SQCUBIC : eVR_CUBIC;
+}
+
 /// Doubles of working memory that a thread needs.
 inline std::size_t GetScratchSize(const Method& oMethod) {
     const std::size_t nCols = static_cast<std::size_t>(oMethod.oWindow.nCols);

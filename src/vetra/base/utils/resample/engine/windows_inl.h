@@ -139,16 +139,13 @@ struct WindowReader {
 
     bool HasMask() const { return oSpan.pabyMask != nullptr; }
 
-    template <int N>
-    void MaskRow(int nRow, F64 (&p)[N]) const {
+    // Of windows of four columns.
+    void MaskRow(int nRow, F64 (&p)[4]) const {
         std::int64_t anPixel[kLanes];
         for (int i = 0; i < kLanes; ++i) {
-            anPixel[i] = panOffset[i] / oSpan.nChan;
+            anPixel[i] = kSingleChannel ? panOffset[i] : panOffset[i] / oSpan.nChan;
         }
-        const unsigned char* pabyRow = oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan);
-        for (int j = 0; j < N; ++j) {
-            p[j] = Gather(pabyRow + j, anPixel);
-        }
+        GatherQuad(oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan), anPixel, p);
     }
 };
 
@@ -203,10 +200,7 @@ struct RootReader {
         return oWindow.template RowInput<Filter>(dy);
     }
     bool HasMask() const { return oWindow.HasMask(); }
-    template <int N>
-    void MaskRow(int nRow, F64 (&p)[N]) const {
-        oWindow.MaskRow(nRow, p);
-    }
+    void MaskRow(int nRow, F64 (&p)[4]) const { oWindow.MaskRow(nRow, p); }
 };
 
 // Windows of rows that are doubles already (and roots, if need be). Columns lie close together
