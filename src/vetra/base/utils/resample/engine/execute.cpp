@@ -93,7 +93,7 @@ struct PackedWindows {
 // Values of the channels of a span that are made at once, and the samples one becomes.
 struct ValueArrays {
     // As many as the values stage may fill at once.
-    alignas(64) double adfValue[2 * kSpanArray] = {};
+    alignas(64) double adfValue[kMostChannelsAtOnce * kSpanArray] = {};
     alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
     PackedWindows oBroken;
 };
@@ -216,6 +216,9 @@ class Run {
     int mnTgtBytes;
     // Samples go from source to target as they are; null where they pass through a double.
     CopyFunction mpfnCopy = nullptr;
+    // Makes the values of mnChannels channels at once; null where that depends on the span.
+    ValuesFunction mpfnPixels = nullptr;
+    int mnChannels;
     ColumnTables moColumns;
     RowPlan moRowPlan;
 };
@@ -229,7 +232,8 @@ Run::Run(const Task& oTask)
       mbOpen(oTask.pabySrcMask == nullptr && oTask.pabyTgtMask == nullptr),
       mnPitch(static_cast<long long>(oTask.nSrcCols) * oTask.nChan),
       mnSrcBytes(kSampleBytes[oTask.nSrcType]),
-      mnTgtBytes(kSampleBytes[oTask.nTgtType]) {
+      mnTgtBytes(kSampleBytes[oTask.nTgtType]),
+      mnChannels(moMethod.nChannels) {
     const Window& oWindow = moMethod.oWindow;
     moLimits.dfFitColFirst = -static_cast<double>(oWindow.nColOff);
     moLimits.dfFitRowFirst = -static_cast<double>(oWindow.nRowOff);
@@ -249,9 +253,13 @@ Run::Run(const Task& oTask)
         mabyModeOfClass[nClass] = moModes.Get(ePO_INTERPOLATED, nClass);
     }
     mnFallback = mabyModeOfClass[kClassNear];
-    if (oTask.oOptions.bShortcuts) {
+    if (oTask.oOptions.ePath != Path::ePlain) {
         if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
+        }
+        if (moMethod.eValues == eVR_BILINEAR && (oTask.nChan == 3 || oTask.nChan == 4)) {
+            mpfnPixels = moStages.apfnBilinearPixels[oTask.nChan - 3][oTask.nSrcType];
+            mnChannels = oTask.nChan;
         }
         // Tables of a single row would be made for nothing, and those of very wide ones are large.
         if (oTask.nTgtRows > 1 && oTask.nTgtCols <= kMostTabulatedCols &&
@@ -260,6 +268,9 @@ Run::Run(const Task& oTask)
             moRowPlan = RowPlan(oTask, moStages, moColumns);
         }
     }
+    if (oTask.oOptions.poTaken != nullptr) {
+        *oTask.oOptions.poTaken = moRowPlan.GetPath();
+    }
 }
 
 Run::ThreadMemory Run::MakeThreadMemory() const {
@@ -267,12 +278,12 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
     const Window& oWindow = moMethod.oWindow;
     // Where no window fits none is computed, and its size is only a number.
     if (oWindow.nCols <= moTask.nSrcCols && oWindow.nRows <= moTask.nSrcRows) {
-        if (moRowPlan.GetKind() != RowKind::eNone) {
+        if (KeepsRows(moRowPlan.GetPath().ePath)) {
             oMemory.poRows = std::make_unique<RowCache>(moTask, moRowPlan);
         } else if (moMethod.eScratch != Scratch::eNone) {
             oMemory.padfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
         }
-        if (moTask.oOptions.bShortcuts && moTask.pabySrcMask != nullptr) {
+        if (moTask.oOptions.ePath != Path::ePlain && moTask.pabySrcMask != nullptr) {
             oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages);
         }
     }
@@ -592,18 +603,22 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
     if (oSpan.pabyBroken != nullptr) {
         Pack(oSpan, oBroken);
     }
-    for (int nChannel = 0; nChannel < moTask.nChan; nChannel += moMethod.nChannels) {
+    ValuesFunction pfnValues = mpfnPixels;
+    if (bWindows && pfnValues == nullptr) {
+        pfnValues = moStages.apfnValues[oSpan.eValues][moTask.nSrcType];
+    }
+    for (int nChannel = 0; nChannel < moTask.nChan; nChannel += mnChannels) {
         double* padfValue = oValues.adfValue;
         if (bWindows && oSpan.poRows != nullptr) {
             padfValue = oSpan.poRows->GetValues(nChannel, oSpan.nFirstCol, oSpan.nPix);
         } else if (bWindows) {
-            moStages.apfnValues[oSpan.eValues][moTask.nSrcType](
-                oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes, padfValue);
+            pfnValues(oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes,
+                      padfValue);
         }
         if (oSpan.pabyBroken != nullptr && oBroken.nPix != 0) {
             ReplaceBroken(oSpan, nChannel, oWindows, oBroken, padfValue);
         }
-        for (int i = 0; i < moMethod.nChannels; ++i) {
+        for (int i = 0; i < mnChannels; ++i) {
             StoreChannel(oSpan, nChannel + i, padfValue + i * kSpanArray, oValues.abySample);
         }
     }

@@ -75,6 +75,22 @@ inline bool AnyTiny(const F64 (&x)[N]) {
     return _mm256_movemask_pd(_mm256_castsi256_pd(vLarge)) != 0xf && AnySmallNumber(x);
 }
 
+// Sums from the left within four.
+inline __m256d RunningSums4(__m256d v) {
+    // Within pairs, and then the first pair's to both of the second.
+    v = v + _mm256_shuffle_pd(_mm256_setzero_pd(), v, 0);
+    const __m256d vFirst = _mm256_permute4x64_pd(v, 0x50);
+    return v + _mm256_blend_pd(_mm256_setzero_pd(), vFirst, 0xc);
+}
+inline F64 RunningSums(F64 a) {
+    const __m256d lo = RunningSums4(a.lo);
+    return {lo, RunningSums4(a.hi) + _mm256_permute4x64_pd(lo, 0xff)};
+}
+inline F64 LastLane(F64 a) {
+    const __m256d v = _mm256_permute4x64_pd(a.hi, 0xff);
+    return {v, v};
+}
+
 inline unsigned Bits(B64 b) {
     return static_cast<unsigned>(_mm256_movemask_pd(b.lo) | _mm256_movemask_pd(b.hi) << 4);
 }

@@ -52,6 +52,16 @@ inline bool AnyTiny(const F64 (&x)[N]) {
     return AnySmallNumber(x);
 }
 
+inline F64 RunningSums(F64 a) {
+    const __m512i vZero = _mm512_setzero_si512();
+    __m512d v = a.v;
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 7));
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 6));
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 4));
+    return {v};
+}
+inline F64 LastLane(F64 a) { return {_mm512_permutexvar_pd(_mm512_set1_epi64(kLanes - 1), a.v)}; }
+
 inline unsigned Bits(B64 b) { return b.m; }
 inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
     const __mmask16 m = _mm_cmpeq_epi8_mask(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),

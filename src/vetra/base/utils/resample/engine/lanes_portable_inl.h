@@ -66,6 +66,20 @@ inline bool AnyTiny(const F64 (&)[N]) {
     return false;
 }
 
+inline F64 RunningSums(F64 a) {
+    double dfSum = 0.0;
+    for (int i = 0; i < kLanes; ++i) {
+        dfSum += a.v[i / 2][i % 2];
+        a.v[i / 2][i % 2] = dfSum;
+    }
+    return a;
+}
+inline F64 LastLane(F64 a) {
+    const double df = a.v[kParts - 1][1];
+    const Pair v{df, df};
+    return {{v, v, v, v}};
+}
+
 inline F64 Set1(double df) {
     const Pair v{df, df};
     return {{v, v, v, v}};

@@ -27,10 +27,16 @@ template <typename Function>
 inline void ForEachRowGroup(const RowWindows& oRows, const Function& fnGroup) {
     for (int i = 0; i < oRows.nPix; i += kLanes) {
         const PickGroup& oGroup = oRows.poGroups[i / kLanes];
-        if (oGroup.bNear) {
-            fnGroup(i, RowReader<true>{oRows, oGroup});
-        } else {
-            fnGroup(i, RowReader<false>{oRows, oGroup});
+        switch (oGroup.eKind) {
+            case PickGroup::eInARow:
+                fnGroup(i, RowReader<PickGroup::eInARow>{oRows, oGroup});
+                break;
+            case PickGroup::eNear:
+                fnGroup(i, RowReader<PickGroup::eNear>{oRows, oGroup});
+                break;
+            default:
+                fnGroup(i, RowReader<PickGroup::eAny>{oRows, oGroup});
+                break;
         }
     }
 }

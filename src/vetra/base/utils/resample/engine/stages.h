@@ -17,6 +17,8 @@ constexpr int kLanes = 8;
 constexpr int kAlignment = 64;
 /// Size of a span's arrays: stages may write up to the end of the last group.
 constexpr int kSpanArray = kSpanPixels + kLanes;
+/// Channels whose values a stage may make at once.
+constexpr int kMostChannelsAtOnce = 4;
 
 /// The ten real sample types, by type code.
 constexpr int kNumSampleTypes = 10;
@@ -89,7 +91,11 @@ struct PickGroup {
     /// Of each column's window, the place of the first sample, counted from nFirst.
     alignas(64) std::int64_t anOffset[kLanes];
     std::int64_t nFirst;
-    bool bNear;  ///< all places, and the three behind each, are below kNearReach
+    enum Kind : unsigned char {
+        eAny,
+        eNear,    ///< all places, and the three behind each, are below kNearReach
+        eInARow,  ///< place k is k
+    } eKind;
 };
 constexpr int kNearReach = 16;
 constexpr int kNearColumns = 4;
@@ -194,8 +200,8 @@ struct StoreLimits {
 };
 
 /// Computes an array of kSpanPixels values from the samples of one channel, or, for a method that
-/// takes two channels at once, two arrays kSpanArray apart. pSrc points at the (first) channel's
-/// first sample.
+/// takes several channels at once, as many arrays kSpanArray apart. pSrc points at the (first)
+/// channel's first sample.
 using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, double* padfValue);
 /// Makes doubles of nCount samples, nChan apart.
 using WidenFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padf);
@@ -204,9 +210,10 @@ using AcrossFunction = void (*)(const RowWindows& oRows, const double* padfRow,
                                 double* padfFiltered);
 /// Computes the values of all pixels of oRows.
 using RowValuesFunction = void (*)(const RowWindows& oRows, double* padfValue);
-/// Adds a stretch of one channel of a source row to sums, or takes it away: nCount samples, nChan
-/// apart.
-using AddRowFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum);
+/// Adds a stretch of one channel of a source row to sums, or takes it away, or adds one and takes
+/// another away: nCount samples, nChan apart.
+using AddRowFunction = void (*)(const void* pAdd, const void* pSubtract, int nChan,
+                                std::int64_t nCount, double* padfSum);
 /// Computes the medians of nPix windows at unit scale.
 using MediansFunction = void (*)(const MedianRows& oRows, const WindowSize& oSize, int nPix,
                                  double* padfValue);
@@ -315,18 +322,21 @@ struct LevelStages {
 
     // Values and stores, by sample type.
     ValuesFunction apfnValues[kNumValues][kNumSampleTypes];
+    /// Bilinear values of three and of four channels at once.
+    ValuesFunction apfnBilinearPixels[2][kNumSampleTypes];
     WidenFunction apfnWiden[kNumSampleTypes];
     /// Makes the roots of the samples.
     WidenFunction apfnWidenRoots[kNumSampleTypes];
     /// The taps of a row's groups, by which rows are filtered.
     void (*pfnColumnTaps)(const void* pParameters, const double* padfFracCol, int nPix,
                           double* padfTaps);
-    /// Means of integers: rows are added to the sums of columns, or taken away; those are added up
-    /// from the left, n + 1 of them; the last stage takes what it needs of them as one row.
+    /// Means of integers: rows are added to the sums of columns (pSubtract may be null), or taken
+    /// away (pAdd is null). Sums of many columns are added up from the left, n + 1 of them; the
+    /// last stages take what they need from one row, of either sums.
     AddRowFunction apfnAddRow[kNumSampleTypes];
-    AddRowFunction apfnSubtractRow[kNumSampleTypes];
     void (*pfnAddUp)(const double* padfSum, std::int64_t nCount, double* padfTotal);
     RowValuesFunction pfnSumValues;
+    RowValuesFunction pfnTotalValues;
     /// Medians, and squared ones; null for most types.
     MediansFunction apfnMedians[kNumSampleTypes];
     MediansFunction apfnSquaredMedians[kNumSampleTypes];

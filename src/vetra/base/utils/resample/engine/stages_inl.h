@@ -15,6 +15,7 @@
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
+//   RunningSums LastLane         sums from the left, up to each lane; the last lane in all
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
@@ -92,13 +93,13 @@ namespace {
     }
 #define VETRA_VALUES(Method, T) &Values<Method, T>
 #define VETRA_COMPLEX_VALUES(Method, T) &ComplexValues<Method, T>
+#define VETRA_PIXELS(kNumChan, T) &BilinearPixels<kNumChan, T>
 #define VETRA_TWINS(Name, Method) \
     VETRA_PER_TYPE(VETRA_VALUES, Method, ), VETRA_PER_TYPE(VETRA_VALUES, Squared<Method>, ),
 #define VETRA_ROWS(Name, Method) RowStagesOf<Method>::kStages,
 #define VETRA_WIDEN(T) &Widen<T, false>
 #define VETRA_WIDEN_ROOTS(T) &Widen<T, true>
-#define VETRA_ADD_ROW(T) &AddRow<T, true>
-#define VETRA_SUBTRACT_ROW(T) &AddRow<T, false>
+#define VETRA_ADD_ROW(T) &AddRow<T>
 #define VETRA_MEDIANS(T) &Medians<T, false>
 #define VETRA_SQUARED_MEDIANS(T) &Medians<T, true>
 #define VETRA_NEAREST(T) &NearestValues<T, false>
@@ -125,13 +126,14 @@ const LevelStages kStages = {
     &Windows,
     &NearestPlaces,
     {VETRA_VALUES_ROWS(VETRA_TWINS) VETRA_PER_TYPE(VETRA_COMPLEX_VALUES, CplxSar, )},
+    {VETRA_PER_TYPE(VETRA_PIXELS, 3, ), VETRA_PER_TYPE(VETRA_PIXELS, 4, )},
     VETRA_PER_TYPE(VETRA_WIDEN),
     VETRA_PER_TYPE(VETRA_WIDEN_ROOTS),
     &ColumnTaps,
     VETRA_PER_TYPE(VETRA_ADD_ROW),
-    VETRA_PER_TYPE(VETRA_SUBTRACT_ROW),
     &AddUp,
     &SumValues,
+    &TotalValues,
     VETRA_PER_SMALL_INTEGER(VETRA_MEDIANS),
     VETRA_PER_SMALL_INTEGER(VETRA_SQUARED_MEDIANS),
     {VETRA_VALUES_ROWS(VETRA_ROWS)},

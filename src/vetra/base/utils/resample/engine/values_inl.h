@@ -69,6 +69,19 @@ VETRA_STAGE void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double
                            });
 }
 
+// Bilinear values of all channels.
+template <int kNumChan, typename T>
+VETRA_STAGE void BilinearPixels(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
+    ForEachGroup<T, false>(oSpan, static_cast<const T*>(pSrc),
+                           [&](int i, const WindowReader<T, false>& oWindow, F64 dx, F64 dy) {
+                               F64 value[kNumChan];
+                               Bilinear::Values(oWindow, dx, dy, value);
+                               for (int c = 0; c < kNumChan; ++c) {
+                                   StoreValue(padfValue + c * kSpanArray + i, value[c]);
+                               }
+                           });
+}
+
 template <typename T, bool kNonNegative>
 VETRA_STAGE void NearestValues(const void* pSrc, const std::int64_t* panOffset,
                                const unsigned char* pabyMode, int nPix, double* padfValue) {

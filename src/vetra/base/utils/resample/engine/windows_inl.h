@@ -97,6 +97,20 @@ struct WindowReader {
         }
     }
 
+    // The samples of the first two pixels of a row, of three or four channels.
+    template <int N>
+    void PixelPair(int nRow, F64 (&p)[N]) const {
+        static_assert(N == 6 || N == 8);
+        // The second four begin where they end with the pixel.
+        F64 first[4];
+        F64 second[4];
+        GatherQuad(At(nRow, 0), panOffset, first);
+        GatherQuad(At(nRow, 0) + (N - 4), panOffset, second);
+        for (int j = 0; j < N; ++j) {
+            p[j] = j < 4 ? first[j] : second[j - (N - 4)];
+        }
+    }
+
     F64 Sample(int nRow, int nCol) const { return Gather(At(nRow, nCol), panOffset); }
 
     // That sample and the one of the next channel.
@@ -203,16 +217,17 @@ struct RootReader {
     void MaskRow(int nRow, F64 (&p)[4]) const { oWindow.MaskRow(nRow, p); }
 };
 
-// Windows of rows that are doubles already (and roots, if need be). Columns lie close together
-// where kNear says so.
-template <bool kNear>
+// Windows of rows that are doubles already (and roots, if need be), which lie as a PickGroup says.
+template <PickGroup::Kind eKind>
 struct RowReader {
     const RowWindows& oRows;
     const PickGroup& oGroup;
 
     F64 Pick(const double* padfRow, int nCol) const {
         const double* p = padfRow + oGroup.nFirst;
-        if constexpr (kNear) {
+        if constexpr (eKind == PickGroup::eInARow) {
+            return Load(p + nCol);
+        } else if constexpr (eKind == PickGroup::eNear) {
             // Four columns come from the same loads.
             const int nShift = nCol % kNearColumns;
             return GatherNear(p + (nCol - nShift), oGroup.anOffset, nShift);
