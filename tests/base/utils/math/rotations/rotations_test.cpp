@@ -123,7 +123,7 @@ std::vector<std::pair<Matrix9, bool>> DifficultMatrices() {
                                2e-10, 1e-9,  1e-8,  3e-8,  1e-7,  1e-6,  1e-5,  1e-4,
                                1e-3,  1e-2,  0.1,   0.5,   0.51,  1.0};
     for (const double dfStep : adfSteps) {
-        const bool bLocked = dfStep > 1e-14 && dfStep < 1.5e-10;
+        const bool bLocked = dfStep > 4e-13 && dfStep < 1.5e-10;
         for (int n = 0; n < 20; ++n) {
             for (int nOrder = 0; nOrder < 6; ++nOrder) {
                 for (const double dfMiddle : {kPi / 2 - dfStep, dfStep - kPi / 2}) {
@@ -212,7 +212,7 @@ TEST(Rotations, EulerAnglesComeBack) {
                 adf[fnAt(1)] = dfSide * (kPi / 2 - 5e-11);
                 adfBack = Convert(eRT_MATRIX, Convert(Type(nOrder), adf, eRT_MATRIX), Type(nOrder));
                 EXPECT_EQ(adfBack[fnAt(0)], 0.0);
-                EXPECT_NEAR(adfBack[fnAt(1)], adf[fnAt(1)], 1e-15);
+                EXPECT_NEAR(adfBack[fnAt(1)], adf[fnAt(1)], 5e-16);
                 const double dfSign = (Axis(nOrder, 1) - Axis(nOrder, 0) + 3) % 3 == 1 ? 1 : -1;
                 const double dfSum = adf[fnAt(2)] + dfSign * dfSide * adf[fnAt(0)];
                 EXPECT_NEAR(std::remainder(adfBack[fnAt(2)] - dfSum, 2 * kPi), 0.0, 1e-14)
@@ -253,8 +253,10 @@ TEST(Rotations, SpecialValues) {
     EXPECT_EQ(fnFour(Convert(eRT_MATRIX, adfIdentity, eRT_AXIS_ANGLE)), (Quat4{0, 0, 1, 0}));
     EXPECT_EQ(fnFour(Convert(eRT_MATRIX, {1, 0, 0, 0, -1, 0, 0, 0, -1}, eRT_QUATERNION)),
               (Quat4{1, 0, 0, 0}));
-    EXPECT_EQ(fnFour(Convert(eRT_MATRIX, {-1, 0, 0, 0, 0, 1, 0, 1, 0}, eRT_QUATERNION)),
-              (Quat4{0, std::sqrt(0.5), std::sqrt(0.5), 0}));
+    EXPECT_LT(
+        Difference(fnFour(Convert(eRT_MATRIX, {-1, 0, 0, 0, 0, -1, 0, -1, 0}, eRT_QUATERNION)),
+                   (Quat4{0, -std::sqrt(0.5), std::sqrt(0.5), 0})),
+        1e-15);
 
     const auto fnToAxisAngle = [](const Quat4& q) {
         Quat4 a;

@@ -25,26 +25,6 @@ Components SlerpBetween(const Components& a, const Components& b, double t) {
 
 }  // namespace
 
-Quaternion::Quaternion(const double& dfX, const double& dfY, const double& dfZ, const double& dfW)
-    : mdfX(dfX), mdfY(dfY), mdfZ(dfZ), mdfW(dfW) {}
-
-Quaternion::~Quaternion() = default;
-
-double Quaternion::operator[](int nIndex) const {
-    switch (nIndex) {
-        case 0:
-            return mdfX;
-        case 1:
-            return mdfY;
-        case 2:
-            return mdfZ;
-        case 3:
-            return mdfW;
-        default:
-            return 0.0;
-    }
-}
-
 Quaternion Quaternion::operator*(double dfFactor) const {
     return ToQuaternion(Scaled(ToComponents(*this), dfFactor));
 }

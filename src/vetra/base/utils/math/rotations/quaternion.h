@@ -15,13 +15,27 @@ class VETRA_EXPORT Quaternion {
  public:
     /// (0, 0, 0, 0), which is not a rotation; the identity is (0, 0, 0, 1).
     Quaternion() = default;
-    Quaternion(const double& dfX, const double& dfY, const double& dfZ, const double& dfW);
+    Quaternion(const double& dfX, const double& dfY, const double& dfZ, const double& dfW)
+        : mdfX(dfX), mdfY(dfY), mdfZ(dfZ), mdfW(dfW) {}
     Quaternion(const Quaternion& oOther) = default;
     Quaternion& operator=(const Quaternion& oOther) = default;
-    virtual ~Quaternion();
+    virtual ~Quaternion() = default;
 
     /// x, y, z, w for 0 to 3; 0.0 for every other index.
-    double operator[](int nIndex) const;
+    double operator[](int nIndex) const {
+        switch (nIndex) {
+            case 0:
+                return mdfX;
+            case 1:
+                return mdfY;
+            case 2:
+                return mdfZ;
+            case 3:
+                return mdfW;
+            default:
+                return 0.0;
+        }
+    }
 
     Quaternion operator*(double dfFactor) const;
     Quaternion operator*(const Quaternion& oOther) const;

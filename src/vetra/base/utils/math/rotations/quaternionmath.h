@@ -157,19 +157,22 @@ Components SquadBetween(const Components& a, const Components& b, const Componen
 }
 
 inline void ToMatrixElements(const Components& q, double* m) {
-    const double xx = q.x * q.x;
-    const double yy = q.y * q.y;
-    const double zz = q.z * q.z;
-    const double ww = q.w * q.w;
-    m[0] = xx - yy - zz + ww;
-    m[1] = 2.0 * (q.x * q.y + q.w * q.z);
-    m[2] = 2.0 * (q.x * q.z - q.w * q.y);
-    m[3] = 2.0 * (q.x * q.y - q.w * q.z);
-    m[4] = yy - xx - zz + ww;
-    m[5] = 2.0 * (q.y * q.z + q.w * q.x);
-    m[6] = 2.0 * (q.x * q.z + q.w * q.y);
-    m[7] = 2.0 * (q.y * q.z - q.w * q.x);
-    m[8] = zz - xx - yy + ww;
+    const double x2 = 2.0 * q.x;
+    const double y2 = 2.0 * q.y;
+    const double z2 = 2.0 * q.z;
+    const double dfSum = q.w * q.w + q.x * q.x;
+    const double dfDiff = q.w * q.w - q.x * q.x;
+    const double dfSumYZ = q.y * q.y + q.z * q.z;
+    const double dfDiffYZ = q.y * q.y - q.z * q.z;
+    m[0] = dfSum - dfSumYZ;
+    m[1] = x2 * q.y + z2 * q.w;
+    m[2] = x2 * q.z - y2 * q.w;
+    m[3] = x2 * q.y - z2 * q.w;
+    m[4] = dfDiff + dfDiffYZ;
+    m[5] = y2 * q.z + x2 * q.w;
+    m[6] = x2 * q.z + y2 * q.w;
+    m[7] = y2 * q.z - x2 * q.w;
+    m[8] = dfDiff - dfDiffYZ;
 }
 
 /// The quaternion of a matrix: 4 times the square of each component is 1 with the diagonal elements
@@ -178,28 +181,26 @@ inline void ToMatrixElements(const Components& q, double* m) {
 /// \param dfMinTrace  w is positive where 4 w^2 is above this; else the greatest of x, y, z is
 inline Components FromMatrixElements(const double* m, double dfMinTrace) {
     const double dfTrace = m[0] + m[4] + m[8] + 1.0;
-    const double dfMax = m[0] >= m[4] && m[0] >= m[8] ? m[0] : (m[4] > m[8] ? m[4] : m[8]);
+    const bool bX = m[0] >= m[4] && m[0] >= m[8];
+    const bool bY = m[4] > m[8];
+    const double dfMax = bX ? m[0] : (bY ? m[4] : m[8]);
     // 4 w^2 is dfTrace, and the greatest of 4 x^2, 4 y^2, 4 z^2 is 2 + 2 dfMax - dfTrace.
-    if (dfTrace > dfMinTrace && dfTrace >= 1.0 + dfMax) {
-        const double r = std::sqrt(dfTrace);
-        const double k = 0.5 / r;
-        return {(m[5] - m[7]) * k, (m[6] - m[2]) * k, (m[1] - m[3]) * k, 0.25 / k};
+    const bool bW = dfTrace > dfMinTrace && dfTrace >= 1.0 + dfMax;
+    const double r = std::sqrt(bW ? dfTrace : 2.0 + 2.0 * dfMax - dfTrace);
+    const double k = 0.5 / r;
+    if (bW) {
+        return {(m[5] - m[7]) * k, (m[6] - m[2]) * k, (m[1] - m[3]) * k, 0.5 * r};
     }
     Components q;
-    if (m[0] >= m[4] && m[0] >= m[8]) {
-        const double r = 2.0 * std::sqrt(m[0] + 1.0 - m[4] - m[8]);
-        q = {0.25 * r, (m[3] + m[1]) / r, (m[2] + m[6]) / r, (m[5] - m[7]) / r};
-    } else if (m[4] > m[8]) {
-        const double r = 2.0 * std::sqrt(m[4] + 1.0 - m[0] - m[8]);
-        q = {(m[3] + m[1]) / r, 0.25 * r, (m[7] + m[5]) / r, (m[6] - m[2]) / r};
+    if (bX) {
+        q = {0.5 * r, (m[3] + m[1]) * k, (m[2] + m[6]) * k, (m[5] - m[7]) * k};
+    } else if (bY) {
+        q = {(m[3] + m[1]) * k, 0.5 * r, (m[7] + m[5]) * k, (m[6] - m[2]) * k};
     } else {
-        const double r = 2.0 * std::sqrt(m[8] + 1.0 - m[0] - m[4]);
-        q = {(m[2] + m[6]) / r, (m[7] + m[5]) / r, 0.25 * r, (m[1] - m[3]) / r};
+        q = {(m[2] + m[6]) * k, (m[7] + m[5]) * k, 0.5 * r, (m[1] - m[3]) * k};
     }
-    if (dfTrace > dfMinTrace && q.w < 0.0) {
-        return {-q.x, -q.y, -q.z, -q.w};
-    }
-    return q;
+    const bool bTurn = dfTrace > dfMinTrace && q.w < 0.0;
+    return bTurn ? Components{-q.x, -q.y, -q.z, -q.w} : q;
 }
 
 }  // namespace vetra::qtn

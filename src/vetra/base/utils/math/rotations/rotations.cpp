@@ -4,7 +4,9 @@
 #include <cfloat>
 #include <cmath>
 #include <cstddef>
+#include <cstdint>
 #include <cstring>
+#include <iterator>
 
 #include "vetra/base/utils/math/rotations/quaternionmath.h"
 #include "vetra/faultcore/exceptions.h"
@@ -43,7 +45,7 @@ template <int I, int J, int K>
 struct Euler {
     static constexpr double kSign = (J - I + 3) % 3 == 1 ? 1.0 : -1.0;
 
-    static void ToMatrix(const double* padfAngles, double* m) {
+    static int ToMatrix(const double* padfAngles, double* m) {
         const double si = kSign * std::sin(padfAngles[I]);
         const double ci = std::cos(padfAngles[I]);
         const double sj = kSign * std::sin(padfAngles[J]);
@@ -59,21 +61,23 @@ struct Euler {
         m[Index(K, I)] = sj;
         m[Index(K, J)] = -cj * si;
         m[Index(K, K)] = cj * ci;
+        return 0;
     }
 
-    static void FromMatrix(const double* m, double* padfAngles) {
+    static int FromMatrix(const double* m, double* padfAngles) {
         double dfSine = kSign * m[Index(K, I)];
         if (std::fabs(dfSine) > 1.0 && std::fabs(dfSine) <= kMaxElement) {
             dfSine = std::copysign(1.0, dfSine);
         }
+        const bool bSteep = std::fabs(dfSine) > kSteep && std::fabs(dfSine) <= 1.0;
+        const double dfCosine =
+            std::sqrt(m[Index(I, I)] * m[Index(I, I)] + m[Index(J, I)] * m[Index(J, I)]);
+        const double dfMiddle = bSteep ? std::atan2(dfSine, dfCosine) : std::asin(dfSine);
         // The four elements with the cosine of the middle angle.
-        const double ii = Snap(m[Index(I, I)]);
-        const double ji = Snap(m[Index(J, I)]);
+        double ii = Snap(m[Index(I, I)]);
+        double ji = Snap(m[Index(J, I)]);
         double kj = Snap(m[Index(K, J)]);
         double kk = Snap(m[Index(K, K)]);
-        const bool bSteep = std::fabs(dfSine) > kSteep && std::fabs(dfSine) <= 1.0;
-        const double dfCosine = bSteep ? std::sqrt(ii * ii + ji * ji) : 0.0;
-        const double dfMiddle = bSteep ? std::atan2(dfSine, dfCosine) : std::asin(dfSine);
         double dfFirst = 0.0;
         double dfLast;
         if (std::fabs(ii) < kGimbalLock && std::fabs(ji) < kGimbalLock &&
@@ -85,21 +89,25 @@ struct Euler {
                 dfLast = std::atan2(dfSide * Snap(m[Index(J, K)]), dfSide * Snap(m[Index(I, K)]));
             }
         } else {
-            dfLast = std::atan2(-kSign * ji, ii);
-            if (bSteep && dfCosine > 0.0) {
-                // The first and last axis nearly agree, so that only the sum or difference of
-                // their angles is well determined. The first one is what remains after the last
-                // one, whatever that is, has been undone.
-                const double s = -ji / dfCosine;
-                const double c = ii / dfCosine;
-                kj = Snap(-(s * m[Index(I, K)] + c * m[Index(J, K)]));
-                kk = Snap(s * m[Index(I, J)] + c * m[Index(J, J)]);
+            const bool bNoise = ii != m[Index(I, I)] || ji != m[Index(J, I)] ||
+                                kj != m[Index(K, J)] || kk != m[Index(K, K)];
+            if ((bSteep || bNoise) && dfCosine > 0.0) {
+                // Where the first and the last axis nearly agree, only the sum or difference of
+                // their angles is well determined, and noise that was taken from one angle shows
+                // in the other. So the first angle is what remains when the last one, whatever it
+                // is, has been undone. Noise is judged without the cosine.
+                ii = Snap(m[Index(I, I)] / dfCosine);
+                ji = Snap(m[Index(J, I)] / dfCosine);
+                kj = Snap(ji * m[Index(I, K)] - ii * m[Index(J, K)]);
+                kk = Snap(ii * m[Index(J, J)] - ji * m[Index(I, J)]);
             }
             dfFirst = std::atan2(-kSign * kj, kk);
+            dfLast = std::atan2(-kSign * ji, ii);
         }
         padfAngles[I] = dfFirst;
         padfAngles[J] = dfMiddle;
         padfAngles[K] = dfLast;
+        return 0;
     }
 };
 
@@ -109,89 +117,135 @@ Components AxisAngleToComponents(const double* padfAxisAngle) {
     return {s * padfAxisAngle[0], s * padfAxisAngle[1], s * padfAxisAngle[2], c};
 }
 
-int CoeffsToMatrix(RotationType eType, const double* padfCoeffs, double* m) {
-    switch (eType) {
-        case eRT_XYZ:
-            Euler<0, 1, 2>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_XZY:
-            Euler<0, 2, 1>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_YXZ:
-            Euler<1, 0, 2>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_YZX:
-            Euler<1, 2, 0>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_ZXY:
-            Euler<2, 0, 1>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_ZYX:
-            Euler<2, 1, 0>::ToMatrix(padfCoeffs, m);
-            return 0;
-        case eRT_QUATERNION:
-            ToMatrixElements(Load(padfCoeffs), m);
-            return 0;
-        case eRT_AXIS_ANGLE:
-            ToMatrixElements(AxisAngleToComponents(padfCoeffs), m);
-            return 0;
-        case eRT_MATRIX:
-            std::memmove(m, padfCoeffs, 9 * sizeof(double));
-            return 0;
-    }
-    return -1;
+bool IsUnitQuaternion(const double* padfQuat) {
+    const Components q = Load(padfQuat);
+    return IsNear((q.w * q.w + q.x * q.x) + (q.y * q.y + q.z * q.z), 1.0, kUnitTolerance);
 }
 
-int MatrixToCoeffs(const double* m, RotationType eType, double* padfCoeffs) {
-    switch (eType) {
-        case eRT_XYZ:
-            Euler<0, 1, 2>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_XZY:
-            Euler<0, 2, 1>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_YXZ:
-            Euler<1, 0, 2>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_YZX:
-            Euler<1, 2, 0>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_ZXY:
-            Euler<2, 0, 1>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_ZYX:
-            Euler<2, 1, 0>::FromMatrix(m, padfCoeffs);
-            return 0;
-        case eRT_QUATERNION:
-            Store(FromMatrixElements(m, kMinTrace), padfCoeffs);
-            return 0;
-        case eRT_AXIS_ANGLE:
-            Store(ToAxisAngle(FromMatrixElements(m, kMinTrace), DBL_EPSILON), padfCoeffs);
-            return 0;
-        case eRT_MATRIX:
-            std::memmove(padfCoeffs, m, 9 * sizeof(double));
-            return 0;
-    }
-    return -1;
+bool IsUnitAxis(const double* padfAxis) {
+    return IsNear(RowDot(padfAxis, padfAxis), 1.0, kUnitTolerance);
 }
 
-// The number of coefficients, 0 for a type outside 0 to 8.
-std::size_t NumCoeffs(RotationType eType) {
+bool IsRotationMatrix(const double* m) {
+    const auto fnMax = [m](int i, int j) { return std::max(std::fabs(m[i]), std::fabs(m[j])); };
+    // NaN may get lost here, but not in the determinant.
+    const double dfMax =
+        std::max(std::max(std::max(fnMax(0, 1), fnMax(2, 3)), std::max(fnMax(4, 5), fnMax(6, 7))),
+                 std::fabs(m[8]));
+    const double dfDeterminant = m[0] * (m[4] * m[8] - m[5] * m[7]) -
+                                 m[1] * (m[3] * m[8] - m[5] * m[6]) +
+                                 m[2] * (m[3] * m[7] - m[4] * m[6]);
+    return dfMax <= kMaxElement && IsNear(RowDot(m, m + 3), 0.0, kUnitTolerance) &&
+           IsNear(RowDot(m + 6, m), 0.0, kUnitTolerance) &&
+           IsNear(RowDot(m + 6, m + 3), 0.0, kUnitTolerance) && IsNear(dfDeterminant, 1.0, 1e-8);
+}
+
+bool IsValid(RotationType eType, const double* padfCoeffs) {
     switch (eType) {
-        case eRT_XYZ:
-        case eRT_XZY:
-        case eRT_YXZ:
-        case eRT_YZX:
-        case eRT_ZXY:
-        case eRT_ZYX:
-            return 3;
         case eRT_QUATERNION:
+            return IsUnitQuaternion(padfCoeffs);
         case eRT_AXIS_ANGLE:
-            return 4;
+            return IsUnitAxis(padfCoeffs);
         case eRT_MATRIX:
-            return 9;
+            return IsRotationMatrix(padfCoeffs);
+        default:
+            return true;
     }
+}
+
+int QuaternionToMatrix(const double* padfQuat, double* m) {
+    ToMatrixElements(Load(padfQuat), m);
     return 0;
+}
+
+int MatrixToQuaternion(const double* m, double* padfQuat) {
+    Store(FromMatrixElements(m, kMinTrace), padfQuat);
+    return 0;
+}
+
+int AxisAngleToMatrix(const double* padfAxisAngle, double* m) {
+    ToMatrixElements(AxisAngleToComponents(padfAxisAngle), m);
+    return 0;
+}
+
+int MatrixToAxisAngle(const double* m, double* padfAxisAngle) {
+    Store(ToAxisAngle(FromMatrixElements(m, kMinTrace), DBL_EPSILON), padfAxisAngle);
+    return 0;
+}
+
+int CopyMatrix(const double* padfFrom, double* padfTo) {
+    std::memmove(padfTo, padfFrom, 9 * sizeof(double));
+    return 0;
+}
+
+// What can be done with a form. Source and target of a function may be the same array.
+struct Form {
+    std::size_t nCoeffs;
+    int (*fnToMatrix)(const double* padfCoeffs, double* m);
+    int (*fnFromMatrix)(const double* m, double* padfCoeffs);
+};
+
+template <int I, int J, int K>
+constexpr Form EulerForm() {
+    return {3, &Euler<I, J, K>::ToMatrix, &Euler<I, J, K>::FromMatrix};
+}
+
+// By type.
+constexpr Form kForms[] = {EulerForm<0, 1, 2>(),
+                           EulerForm<0, 2, 1>(),
+                           EulerForm<1, 0, 2>(),
+                           EulerForm<1, 2, 0>(),
+                           EulerForm<2, 0, 1>(),
+                           EulerForm<2, 1, 0>(),
+                           {4, &QuaternionToMatrix, &MatrixToQuaternion},
+                           {4, &AxisAngleToMatrix, &MatrixToAxisAngle},
+                           {9, &CopyMatrix, &CopyMatrix}};
+
+// Null for a type outside 0 to 8.
+const Form* FindForm(RotationType eType) {
+    const auto nType = static_cast<std::size_t>(eType);
+    return nType < std::size(kForms) ? kForms + nType : nullptr;
+}
+
+// Apart from its caller, whose cheapest ways need no registers saved.
+[[gnu::noinline]] int ConvertValid(RotationType eSrcType, const double* padfSrcCoeffs,
+                                   RotationType eTgtType, double* padfTgtCoeffs) {
+    const Form* poSrc = FindForm(eSrcType);
+    const Form* poTgt = FindForm(eTgtType);
+    if (poSrc == nullptr || poTgt == nullptr) {
+        return -1;
+    }
+    if (eSrcType == eRT_MATRIX) {
+        return poTgt->fnFromMatrix(padfSrcCoeffs, padfTgtCoeffs);
+    }
+    if (eTgtType == eRT_MATRIX) {
+        return poSrc->fnToMatrix(padfSrcCoeffs, padfTgtCoeffs);
+    }
+    if (eSrcType == eTgtType && padfSrcCoeffs != padfTgtCoeffs) {
+        std::memmove(padfTgtCoeffs, padfSrcCoeffs, poSrc->nCoeffs * sizeof(double));
+        return 0;
+    }
+    if (eSrcType == eRT_QUATERNION && eTgtType == eRT_AXIS_ANGLE) {
+        return QuaternionToAxisAngle(padfSrcCoeffs, padfTgtCoeffs);
+    }
+    if (eSrcType == eRT_AXIS_ANGLE && eTgtType == eRT_QUATERNION) {
+        return AxisAngleToQuaternion(padfSrcCoeffs, padfTgtCoeffs);
+    }
+    double m[9];
+    poSrc->fnToMatrix(padfSrcCoeffs, m);
+    return poTgt->fnFromMatrix(m, padfTgtCoeffs);
+}
+
+// Apart from its caller, like ConvertValid. The location is the caller's.
+[[noreturn, gnu::cold, gnu::noinline]] void RefuseRotation(const char* pszFile,
+                                                           const char* pszFunction,
+                                                           std::uint32_t nLine) {
+    throw ParameterException(
+        "padfSrcCoeffs", ParameterException::eInvalid, "", "",
+        "The provided coefficient arrray did not pass tests designed to ensure that it represents "
+        "a valid rotation.  Please consult the IsValidRotation() documentation for a description "
+        "of validity criteria",
+        pszFile, pszFunction, nLine);
 }
 
 void CopyToRows(const double* m, double* const* papadfRows) {
@@ -211,82 +265,50 @@ void ToRows(ElementaryMatrix fnMatrix, double dfAngle, double* const* papadfRows
 }  // namespace
 
 bool IsValidRotation(RotationType eType, const double* padfCoeffs) {
-    const double* p = padfCoeffs;
-    switch (eType) {
-        case eRT_QUATERNION:
-            return IsNear(p[0] * p[0] + p[1] * p[1] + p[2] * p[2] + p[3] * p[3], 1.0,
-                          kUnitTolerance);
-        case eRT_AXIS_ANGLE:
-            return IsNear(RowDot(p, p), 1.0, kUnitTolerance);
-        case eRT_MATRIX: {
-            const double dfDeterminant = p[0] * (p[4] * p[8] - p[5] * p[7]) -
-                                         p[1] * (p[3] * p[8] - p[5] * p[6]) +
-                                         p[2] * (p[3] * p[7] - p[4] * p[6]);
-            return std::all_of(p, p + 9, [](double df) { return std::fabs(df) <= kMaxElement; }) &&
-                   IsNear(RowDot(p, p + 3), 0.0, 1e-9) && IsNear(RowDot(p + 6, p), 0.0, 1e-9) &&
-                   IsNear(RowDot(p + 6, p + 3), 0.0, 1e-9) && IsNear(dfDeterminant, 1.0, 1e-8);
-        }
-        default:
-            return true;
-    }
+    return IsValid(eType, padfCoeffs);
 }
 
 int ConvertRotation(RotationType eSrcType, const double* padfSrcCoeffs, RotationType eTgtType,
                     double* padfTgtCoeffs) {
-    if (!IsValidRotation(eSrcType, padfSrcCoeffs)) {
-        throw ParameterException(
-            "padfSrcCoeffs", ParameterException::eInvalid, "", "",
-            "The provided coefficient arrray did not pass tests designed to ensure that it "
-            "represents a valid rotation.  Please consult the IsValidRotation() documentation for "
-            "a description of validity criteria",
-            VETRA_HERE);
+    if (!IsValid(eSrcType, padfSrcCoeffs)) {
+        RefuseRotation(VETRA_HERE);
     }
-    if (eSrcType == eTgtType && padfSrcCoeffs != padfTgtCoeffs) {
-        const std::size_t nCoeffs = NumCoeffs(eSrcType);
-        std::memmove(padfTgtCoeffs, padfSrcCoeffs, nCoeffs * sizeof(double));
-        return nCoeffs == 0 ? -1 : 0;
+    // Takes no longer than finding out what to do, so that is left out.
+    if (eSrcType == eRT_QUATERNION && eTgtType == eRT_MATRIX) {
+        return QuaternionToMatrix(padfSrcCoeffs, padfTgtCoeffs);
     }
-    if (eSrcType == eRT_QUATERNION && eTgtType == eRT_AXIS_ANGLE) {
-        return QuaternionToAxisAngle(padfSrcCoeffs, padfTgtCoeffs);
-    }
-    if (eSrcType == eRT_AXIS_ANGLE && eTgtType == eRT_QUATERNION) {
-        return AxisAngleToQuaternion(padfSrcCoeffs, padfTgtCoeffs);
-    }
-    if (eSrcType == eRT_MATRIX) {
-        return MatrixToCoeffs(padfSrcCoeffs, eTgtType, padfTgtCoeffs);
-    }
-    if (eTgtType == eRT_MATRIX) {
-        return CoeffsToMatrix(eSrcType, padfSrcCoeffs, padfTgtCoeffs);
-    }
-    double m[9];
-    const int nResult = CoeffsToMatrix(eSrcType, padfSrcCoeffs, m);
-    return nResult != 0 ? nResult : MatrixToCoeffs(m, eTgtType, padfTgtCoeffs);
+    return ConvertValid(eSrcType, padfSrcCoeffs, eTgtType, padfTgtCoeffs);
 }
 
 int RotToMatrix(RotationType eType, const double* padfCoeffs, double* const* papadfRows) {
-    double m[9];
-    const int nResult = CoeffsToMatrix(eType, padfCoeffs, m);
-    if (nResult == 0) {
-        CopyToRows(m, papadfRows);
+    const Form* poForm = FindForm(eType);
+    if (poForm == nullptr) {
+        return -1;
     }
-    return nResult;
+    double m[9];
+    poForm->fnToMatrix(padfCoeffs, m);
+    CopyToRows(m, papadfRows);
+    return 0;
 }
 
 int MatrixToRot(const double* const* papadfRows, RotationType eType, double* padfCoeffs) {
+    const Form* poForm = FindForm(eType);
+    if (poForm == nullptr) {
+        return -1;
+    }
     double m[9];
     for (int i = 0; i < 3; ++i) {
         std::copy_n(papadfRows[i], 3, m + 3 * i);
     }
-    return MatrixToCoeffs(m, eType, padfCoeffs);
+    return poForm->fnFromMatrix(m, padfCoeffs);
 }
 
 int MatrixElementsToQuaternion(const double* padfMatrix, double* padfQuat) {
-    Store(FromMatrixElements(padfMatrix, kMinTrace), padfQuat);
-    return 0;
+    return MatrixToQuaternion(padfMatrix, padfQuat);
 }
 
 void QuaternionToMatrixElements(const double* padfQuat, double* padfMatrix) {
-    ToMatrixElements(Load(padfQuat), padfMatrix);
+    QuaternionToMatrix(padfQuat, padfMatrix);
 }
 
 int AxisAngleToQuaternion(const double* padfAxisAngle, double* padfQuat) {
