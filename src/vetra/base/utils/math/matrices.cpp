@@ -66,13 +66,14 @@ void MultiplyByTranspose(double* const* a, int n) {
 }  // namespace
 
 void AllocMat(double**& papadfMat, int nRows, int nCols) {
+    std::unique_ptr<double[]> padfBlock(new double[Count(nRows) * Count(nCols)]);
     // FreeMat finds the block in row 0, which must be there without rows too.
-    auto papadfRows = std::make_unique<double*[]>(std::max<std::size_t>(Count(nRows), 1));
-    papadfRows[0] = new double[Count(nRows) * Count(nCols)];
+    auto** papadfRows = new double*[std::max<std::size_t>(Count(nRows), 1)];
+    papadfRows[0] = padfBlock.release();
     for (int i = 1; i < nRows; ++i) {
-        papadfRows[Count(i)] = papadfRows[Count(i - 1)] + Count(nCols);
+        papadfRows[i] = papadfRows[i - 1] + nCols;
     }
-    papadfMat = papadfRows.release();
+    papadfMat = papadfRows;
 }
 
 void FreeMat(double**& papadfMat) {
