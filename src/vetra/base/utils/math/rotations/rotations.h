@@ -56,7 +56,7 @@ enum RotationType : int {
 /// is taken as it is, so that 2 pi gives (0, 0, 0, -1).
 ///
 /// A source of finite numbers keeps its matrix to 1e-12, and within the range of gimbal lock to
-/// 2e-10; Euler angles and angles that are NaN or infinite give NaN.
+/// 3e-10; Euler angles and angles that are NaN or infinite give NaN.
 ///
 /// Source and target may be the same array. With the same type they are left to the general way in
 /// that case: the coefficients may come back in another equal form. With the same type and
