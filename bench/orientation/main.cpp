@@ -4,6 +4,7 @@
 #include <benchmark/benchmark.h>
 
 #include <array>
+#include <cmath>
 #include <cstdio>
 #include <map>
 #include <random>
@@ -192,12 +193,16 @@ class TableReporter : public benchmark::BenchmarkReporter {
     }
 
     void Finalize() override {
+        const auto fnCell = [](const char* pszFormat, double df) {
+            return df > 0.0 && std::isfinite(df) ? FormatString(pszFormat, df) : std::string();
+        };
         std::puts("| work | vetra, ns | Eigen, ns | ours / Eigen's |\n|---|---|---|---|");
         for (auto& [sWork, oTimes] : moTimes) {
             const double dfOurs = oTimes["vetra"];
             const double dfEigens = oTimes["Eigen"];
-            std::printf("| %s | %.1f | %.1f | %.2f |\n", sWork.c_str(), dfOurs, dfEigens,
-                        dfOurs / dfEigens);
+            std::printf("| %s | %s | %s | %s |\n", sWork.c_str(), fnCell("%.1f", dfOurs).c_str(),
+                        fnCell("%.1f", dfEigens).c_str(),
+                        fnCell("%.2f", dfOurs / dfEigens).c_str());
         }
     }
 

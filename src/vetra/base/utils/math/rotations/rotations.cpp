@@ -82,6 +82,7 @@ struct Euler {
         double dfLast;
         if (std::fabs(ii) < kGimbalLock && std::fabs(ji) < kGimbalLock &&
             std::fabs(kj) < kGimbalLock && std::fabs(kk) < kGimbalLock) {
+            // Only elements without the cosine tell something.
             if (kSign > 0.0) {
                 dfLast = std::atan2(Snap(m[Index(I, J)]), Snap(m[Index(J, J)]));
             } else {
