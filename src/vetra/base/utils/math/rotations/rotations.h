@@ -55,8 +55,9 @@ enum RotationType : int {
 /// w. Without a rotation the axis is (0, 0, 1). From axis and angle to a quaternion, half the angle
 /// is taken as it is, so that 2 pi gives (0, 0, 0, -1).
 ///
-/// A source of finite numbers keeps its matrix to 1e-12, and within the range of gimbal lock to
-/// 3e-10; Euler angles and angles that are NaN or infinite give NaN.
+/// A source of finite numbers keeps its matrix to 1e-14, but that each element that counts as 0 may
+/// cost up to 1e-12, and gimbal lock, where it is one by its tolerance only, up to 3e-10. Euler
+/// angles and angles that are NaN or infinite give NaN.
 ///
 /// Source and target may be the same array. With the same type they are left to the general way in
 /// that case: the coefficients may come back in another equal form. With the same type and
