@@ -109,9 +109,9 @@ VETRA_EXPORT Quaternion operator*(double dfFactor, const Quaternion& oQuat);
 VETRA_EXPORT Quaternion operator/(double dfDividend, const Quaternion& oQuat);
 
 /// Spherical linear interpolation: oStart times (conj(oStart) oEnd) to the power of t, at constant
-/// angular speed. Takes the way that the signs of the two give, which may be the longer one: use
-/// `Quaternion::MakeSameSign` before. The result is not normalised. Ends that are less than 4e-8
-/// radians apart have no logarithm between them: the result is oStart.
+/// angular speed. Takes the way that the signs of the two give: the shorter one if their dot
+/// product is not negative. The result is not normalised. Ends that are less than 4e-8 radians
+/// apart count as equal, by the rule of `Log`: the result is oStart.
 ///
 /// \param oStart   unit quaternion, the result if t is 0 within epsilon
 /// \param oEnd     unit quaternion, the result if t is 1 within epsilon
