@@ -325,6 +325,27 @@ TEST(Rotations, Validity) {
     EXPECT_TRUE(IsValidRotation(kNine, nullptr));
 }
 
+TEST(Rotations, ValidityOfPerturbedMatrices) {
+    Random oRandom;
+    int anCounts[2] = {0, 0};
+    for (int n = 0; n < 20000; ++n) {
+        Matrix9 m = OursOf(
+            Turns(n % 6, oRandom.Angle(), n % 7 == 0 ? kPi / 2 : 0.3, 0.0).toRotationMatrix());
+        const double dfSize = std::pow(10.0, -7.0 - n % 50 * 0.1);
+        for (double& df : m) {
+            df += dfSize * oRandom.Angle();
+        }
+        const Eigen::Map<const Eigen::Matrix<double, 3, 3, Eigen::RowMajor>> o(m.data());
+        const bool bExpected =
+            o.cwiseAbs().maxCoeff() <= 1.000000001 && std::abs(o.row(0).dot(o.row(1))) <= 1e-9 &&
+            std::abs(o.row(2).dot(o.row(0))) <= 1e-9 && std::abs(o.row(2).dot(o.row(1))) <= 1e-9 &&
+            std::abs(o.determinant() - 1.0) <= 1e-8;
+        ASSERT_EQ(IsValidRotation(eRT_MATRIX, m.data()), bExpected) << n;
+        ++anCounts[bExpected];
+    }
+    EXPECT_GT(std::min(anCounts[0], anCounts[1]), 1000);
+}
+
 TEST(Rotations, ElementsBeyondOneCountAsOne) {
     const double df = 1.0 + 5e-10;
     const Coeffs adf = Convert(eRT_MATRIX, {0, 1, 0, 0, 0, 1, df, 0, 0}, eRT_XYZ);

@@ -127,16 +127,25 @@ bool IsUnitAxis(const double* padfAxis) {
     return IsNear(RowDot(padfAxis, padfAxis), 1.0, kUnitTolerance);
 }
 
-bool IsRotationMatrix(const double* m) {
-    const auto fnMax = [m](int i, int j) { return std::max(std::fabs(m[i]), std::fabs(m[j])); };
-    // NaN may get lost here, but not in the determinant.
-    const double dfMax =
-        std::max(std::max(std::max(fnMax(0, 1), fnMax(2, 3)), std::max(fnMax(4, 5), fnMax(6, 7))),
-                 std::fabs(m[8]));
+// A quick test that nearly all rotations pass: it asks for a tenth of the tolerances. With two
+// orthogonal unit rows and their cross product as the third, all else follows.
+bool IsPreciseRotation(const double* m) {
+    const double dfSquare0 = RowDot(m, m) - 1.0;
+    const double dfSquare1 = RowDot(m + 3, m + 3) - 1.0;
+    const double dfDot = RowDot(m, m + 3);
+    const double x = m[1] * m[5] - m[2] * m[4] - m[6];
+    const double y = m[2] * m[3] - m[0] * m[5] - m[7];
+    const double z = m[0] * m[4] - m[1] * m[3] - m[8];
+    return dfSquare0 * dfSquare0 + dfSquare1 * dfSquare1 + dfDot * dfDot + x * x + y * y + z * z <=
+           1e-20;
+}
+
+[[gnu::noinline]] bool IsTolerableRotation(const double* m) {
     const double dfDeterminant = m[0] * (m[4] * m[8] - m[5] * m[7]) -
                                  m[1] * (m[3] * m[8] - m[5] * m[6]) +
                                  m[2] * (m[3] * m[7] - m[4] * m[6]);
-    return dfMax <= kMaxElement && IsNear(RowDot(m, m + 3), 0.0, kUnitTolerance) &&
+    return std::all_of(m, m + 9, [](double df) { return std::fabs(df) <= kMaxElement; }) &&
+           IsNear(RowDot(m, m + 3), 0.0, kUnitTolerance) &&
            IsNear(RowDot(m + 6, m), 0.0, kUnitTolerance) &&
            IsNear(RowDot(m + 6, m + 3), 0.0, kUnitTolerance) && IsNear(dfDeterminant, 1.0, 1e-8);
 }
@@ -148,7 +157,7 @@ bool IsValid(RotationType eType, const double* padfCoeffs) {
         case eRT_AXIS_ANGLE:
             return IsUnitAxis(padfCoeffs);
         case eRT_MATRIX:
-            return IsRotationMatrix(padfCoeffs);
+            return IsPreciseRotation(padfCoeffs) || IsTolerableRotation(padfCoeffs);
         default:
             return true;
     }
