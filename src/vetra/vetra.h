@@ -3,6 +3,11 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/math/matrices.h"
+#include "vetra/base/utils/math/rotations/quaternion.h"
+#include "vetra/base/utils/math/rotations/quatfunctions.h"
+#include "vetra/base/utils/math/rotations/rotations.h"
+#include "vetra/base/utils/math/vectors.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
