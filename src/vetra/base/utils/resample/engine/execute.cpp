@@ -90,11 +90,11 @@ struct PackedWindows {
     alignas(64) double adfValue[kSpanArray] = {};
 };
 
-// Values of the channels of a span that are made at once, and the samples one becomes.
+// Values of the channels of a span that are made at once, and the samples that are written at once.
 struct ValueArrays {
     // As many as the values stage may fill at once.
     alignas(64) double adfValue[kMostChannelsAtOnce * kSpanArray] = {};
-    alignas(64) unsigned char abySample[kSpanArray * sizeof(double)] = {};
+    alignas(64) unsigned char abySample[kMostChannelsAtOnce * kSpanArray * sizeof(double)] = {};
     PackedWindows oBroken;
 };
 
@@ -185,12 +185,16 @@ class Run {
     void Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oValues) const;
     void ReplaceBroken(const Span& oSpan, int nChannel, WindowSpan oWindows, PackedWindows& oBroken,
                        double* padfValue) const;
-    void StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
-                      unsigned char* pabySample) const;
-    void CopyRuns(const Span& oSpan) const;
-    void FillBackground(long long nFirst, int nPix) const;
+    void MakeSamples(const Span& oSpan, int nChannel, double* padfValue,
+                     unsigned char* pabySample) const;
+    void Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const;
+    template <typename Function>
+    void WithSampleBits(const Function& fnDo) const;
     template <typename Bits>
-    void Deliver(const Span& oSpan, int nChannel, unsigned char* pabySample) const;
+    void AddBackground(const Span& oSpan, unsigned char* pabySample) const;
+    void CopyRuns(const Span& oSpan) const;
+    void Copy(const Span& oSpan, int nBegin, int nEnd) const;
+    void FillBackground(long long nFirst, int nPix) const;
 
     const char* SrcRow(long long nRow) const {
         return static_cast<const char*>(moTask.pSrc) + nRow * mnPitch * mnSrcBytes;
@@ -219,6 +223,8 @@ class Run {
     // Makes the values of mnChannels channels at once; null where that depends on the span.
     ValuesFunction mpfnPixels = nullptr;
     int mnChannels;
+    // All channels of a span are written together.
+    bool mbInterleaves = false;
     ColumnTables moColumns;
     RowPlan moRowPlan;
 };
@@ -257,7 +263,8 @@ Run::Run(const Task& oTask)
         if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
         }
-        if (moMethod.eValues == eVR_BILINEAR && (oTask.nChan == 3 || oTask.nChan == 4)) {
+        mbInterleaves = oTask.nChan == 3 || oTask.nChan == 4;
+        if (moMethod.eValues == eVR_BILINEAR && mbInterleaves) {
             mpfnPixels = moStages.apfnBilinearPixels[oTask.nChan - 3][oTask.nSrcType];
             mnChannels = oTask.nChan;
         }
@@ -603,6 +610,7 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
     if (oSpan.pabyBroken != nullptr) {
         Pack(oSpan, oBroken);
     }
+    const bool bInterleave = mbInterleaves && (oSpan.nModes & kSetUntouched) == 0;
     ValuesFunction pfnValues = mpfnPixels;
     if (bWindows && pfnValues == nullptr) {
         pfnValues = moStages.apfnValues[oSpan.eValues][moTask.nSrcType];
@@ -619,8 +627,19 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
             ReplaceBroken(oSpan, nChannel, oWindows, oBroken, padfValue);
         }
         for (int i = 0; i < mnChannels; ++i) {
-            StoreChannel(oSpan, nChannel + i, padfValue + i * kSpanArray, oValues.abySample);
+            unsigned char* pabySample = oValues.abySample;
+            if (bInterleave) {
+                pabySample += std::ptrdiff_t{nChannel + i} * kSpanArray * mnTgtBytes;
+            }
+            MakeSamples(oSpan, nChannel + i, padfValue + i * kSpanArray, pabySample);
+            if (!bInterleave) {
+                Deliver(oSpan, nChannel + i, pabySample);
+            }
         }
+    }
+    if (bInterleave) {
+        moStages.apfnInterleave[moTask.nChan - 3][moTask.nTgtType](oValues.abySample, oSpan.nPix,
+                                                                   TgtPixel(oSpan.nFirst));
     }
 }
 
@@ -640,9 +659,10 @@ void Run::ReplaceBroken(const Span& oSpan, int nChannel, WindowSpan oWindows,
     }
 }
 
-// Adds the nearest samples to the values of a channel, and writes them.
-void Run::StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
-                       unsigned char* pabySample) const {
+// Adds the nearest samples to the values of a channel, makes target samples of them, and puts the
+// background among those.
+void Run::MakeSamples(const Span& oSpan, int nChannel, double* padfValue,
+                      unsigned char* pabySample) const {
     if ((oSpan.nModes & kSetNearest) != 0) {
         const auto& apfnNearest =
             moMethod.bNonNegative ? moStages.apfnNonNegativeNearest : moStages.apfnNearest;
@@ -651,82 +671,110 @@ void Run::StoreChannel(const Span& oSpan, int nChannel, double* padfValue,
                                      padfValue);
     }
     moStages.apfnStore[moTask.nTgtType](padfValue, oSpan.nPix, moTask.pLimits, pabySample);
+    if ((oSpan.nModes & kSetBackground) != 0) {
+        WithSampleBits([&](auto nBits) { AddBackground<decltype(nBits)>(oSpan, pabySample); });
+    }
+}
+
+// Calls a function with a number as large as a target sample.
+template <typename Function>
+void Run::WithSampleBits(const Function& fnDo) const {
     switch (mnTgtBytes) {
         case 1:
-            Deliver<std::uint8_t>(oSpan, nChannel, pabySample);
+            fnDo(std::uint8_t{});
             break;
         case 2:
-            Deliver<std::uint16_t>(oSpan, nChannel, pabySample);
+            fnDo(std::uint16_t{});
             break;
         case 4:
-            Deliver<std::uint32_t>(oSpan, nChannel, pabySample);
+            fnDo(std::uint32_t{});
             break;
         default:
-            Deliver<std::uint64_t>(oSpan, nChannel, pabySample);
+            fnDo(std::uint64_t{});
             break;
     }
 }
 
-// Writes one channel of a span: samples, background, or nothing, as each pixel's mode says.
 template <typename Bits>
-void Run::Deliver(const Span& oSpan, int nChannel, unsigned char* pabySample) const {
-    constexpr std::size_t kBytes = sizeof(Bits);
-    const auto nPix = static_cast<std::size_t>(oSpan.nPix);
-    const std::size_t nStep = static_cast<std::size_t>(moTask.nChan) * kBytes;
-    char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::size_t>(nChannel) * kBytes;
-    if ((oSpan.nModes & kSetUntouched) != 0) {
-        for (std::size_t i = 0; i < nPix; ++i) {
-            if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
-                std::memcpy(pTgt + i * nStep,
-                            oSpan.pabyMode[i] == ePO_BACKGROUND ? moTask.pBackground
-                                                                : pabySample + i * kBytes,
-                            kBytes);
+void Run::AddBackground(const Span& oSpan, unsigned char* pabySample) const {
+    Bits background;
+    std::memcpy(&background, moTask.pBackground, sizeof background);
+    for (std::size_t i = 0; i < static_cast<std::size_t>(oSpan.nPix); ++i) {
+        Bits sample;
+        std::memcpy(&sample, pabySample + i * sizeof(Bits), sizeof sample);
+        sample = oSpan.pabyMode[i] == ePO_BACKGROUND ? background : sample;
+        std::memcpy(pabySample + i * sizeof(Bits), &sample, sizeof sample);
+    }
+}
+
+// Writes one channel of a span, but where a pixel stays untouched.
+void Run::Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const {
+    WithSampleBits([&](auto nBits) {
+        constexpr std::size_t kBytes = sizeof nBits;
+        const auto nPix = static_cast<std::size_t>(oSpan.nPix);
+        const std::size_t nStep = static_cast<std::size_t>(moTask.nChan) * kBytes;
+        char* pTgt = TgtPixel(oSpan.nFirst) + static_cast<std::size_t>(nChannel) * kBytes;
+        if ((oSpan.nModes & kSetUntouched) != 0) {
+            for (std::size_t i = 0; i < nPix; ++i) {
+                if (oSpan.pabyMode[i] != ePO_UNTOUCHED) {
+                    std::memcpy(pTgt + i * nStep, pabySample + i * kBytes, kBytes);
+                }
+            }
+        } else if (nStep == kBytes) {
+            std::memcpy(pTgt, pabySample, nPix * kBytes);
+        } else {
+            for (std::size_t i = 0; i < nPix; ++i) {
+                std::memcpy(pTgt + i * nStep, pabySample + i * kBytes, kBytes);
             }
         }
-        return;
-    }
-    if ((oSpan.nModes & kSetBackground) != 0) {
-        Bits background;
-        std::memcpy(&background, moTask.pBackground, kBytes);
-        for (std::size_t i = 0; i < nPix; ++i) {
-            Bits sample;
-            std::memcpy(&sample, pabySample + i * kBytes, kBytes);
-            sample = oSpan.pabyMode[i] == ePO_BACKGROUND ? background : sample;
-            std::memcpy(pabySample + i * kBytes, &sample, kBytes);
-        }
-    }
-    if (nStep == kBytes) {
-        std::memcpy(pTgt, pabySample, nPix * kBytes);
-        return;
-    }
-    for (std::size_t i = 0; i < nPix; ++i) {
-        std::memcpy(pTgt + i * nStep, pabySample + i * kBytes, kBytes);
-    }
+    });
 }
 
 // Nearest sampling without a change of type: whole pixels, clamped where they arrive.
 void Run::CopyRuns(const Span& oSpan) const {
-    const int nChan = moTask.nChan;
-    for (int nBegin = 0; nBegin < oSpan.nPix;) {
-        const unsigned char nMode = oSpan.pabyMode[nBegin];
-        int nEnd = oSpan.nPix;
-        if (oSpan.nModes != kSetNearest) {
-            nEnd = nBegin + 1;
-            while (nEnd < oSpan.nPix && oSpan.pabyMode[nEnd] == nMode) {
-                ++nEnd;
-            }
+    const auto fnRunEnd = [&](int nBegin) {
+        int nEnd = nBegin + 1;
+        while (nEnd < oSpan.nPix && oSpan.pabyMode[nEnd] == oSpan.pabyMode[nBegin]) {
+            ++nEnd;
         }
-        if (nMode == ePO_NEAREST) {
-            char* pTgt = TgtPixel(oSpan.nFirst + nBegin);
-            mpfnCopy(oSpan.pNearestSrc, oSpan.panNearest + nBegin, nEnd - nBegin, nChan, pTgt);
-            if (!moTask.bClampIsOpen) {
-                moStages.apfnClamp[moTask.nTgtType](
-                    pTgt, static_cast<std::int64_t>(nEnd - nBegin) * nChan, moTask.pLimits);
+        return nEnd;
+    };
+    if ((oSpan.nModes & kSetUntouched) == 0) {
+        // Pixels of other modes have places too.
+        Copy(oSpan, 0, oSpan.nPix);
+        if ((oSpan.nModes & kSetBackground) == 0) {
+            return;
+        }
+        for (int nBegin = 0; nBegin < oSpan.nPix;) {
+            const void* p = std::memchr(oSpan.pabyMode + nBegin, ePO_BACKGROUND,
+                                        static_cast<std::size_t>(oSpan.nPix - nBegin));
+            if (p == nullptr) {
+                break;
             }
-        } else if (nMode == ePO_BACKGROUND) {
+            nBegin = static_cast<int>(static_cast<const unsigned char*>(p) - oSpan.pabyMode);
+            const int nEnd = fnRunEnd(nBegin);
+            FillBackground(oSpan.nFirst + nBegin, nEnd - nBegin);
+            nBegin = nEnd;
+        }
+        return;
+    }
+    for (int nBegin = 0; nBegin < oSpan.nPix;) {
+        const int nEnd = fnRunEnd(nBegin);
+        if (oSpan.pabyMode[nBegin] == ePO_NEAREST) {
+            Copy(oSpan, nBegin, nEnd);
+        } else if (oSpan.pabyMode[nBegin] == ePO_BACKGROUND) {
             FillBackground(oSpan.nFirst + nBegin, nEnd - nBegin);
         }
         nBegin = nEnd;
+    }
+}
+
+void Run::Copy(const Span& oSpan, int nBegin, int nEnd) const {
+    char* pTgt = TgtPixel(oSpan.nFirst + nBegin);
+    mpfnCopy(oSpan.pNearestSrc, oSpan.panNearest + nBegin, nEnd - nBegin, moTask.nChan, pTgt);
+    if (!moTask.bClampIsOpen) {
+        moStages.apfnClamp[moTask.nTgtType](
+            pTgt, static_cast<std::int64_t>(nEnd - nBegin) * moTask.nChan, moTask.pLimits);
     }
 }
 

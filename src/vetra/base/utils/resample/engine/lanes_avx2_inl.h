@@ -157,3 +157,12 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
 inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
     return Gather(p + nShift, o);
 }
+
+inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    return PickBits(panMap, panPlace);
+}
+inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
+    std::int64_t anPlace[kLanes];
+    StoreIntegers(anPlace, place);
+    return PickBits(panMap, anPlace);
+}

@@ -227,3 +227,11 @@ inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
 inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* panOffset) {
     return ~(ByteBits(p, panOffset, 0) | ByteBits(p + 1, panOffset, 0)) & 0xffu;
 }
+inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    return PickBits(panMap, panPlace);
+}
+inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
+    std::int64_t anPlace[kLanes];
+    StoreIntegers(anPlace, place);
+    return PickBits(panMap, anPlace);
+}

@@ -9,7 +9,7 @@ namespace {
 constexpr std::int64_t kBlockWords = 8;
 constexpr std::int64_t kLeastBlockRows = 64;
 // Source pixels of a rectangle; a span of 256 pixels that are far apart has a larger one.
-constexpr double kMostPixels = 1 << 20;
+constexpr double kMostPixels = 1 << 22;
 
 // Leaves the bits set behind which nNumBits - 1 others are set: the row and itself moved by one,
 // then both by two, and so on.

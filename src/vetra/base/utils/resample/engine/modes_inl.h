@@ -115,21 +115,6 @@ VETRA_STAGE PositionBounds Bounds(const double* padfCol, const double* padfRow, 
     return o;
 }
 
-// Bits of eight numbers, set where a map has a bit at that number.
-inline unsigned MapBits(const std::uint64_t* panBits, const std::int64_t* panPlace) {
-    std::uint64_t nBits = 0;
-    for (int i = 0; i < kLanes; ++i) {
-        const std::int64_t n = panPlace[i];
-        nBits |= (panBits[n >> 6] >> (n & 63) & 1u) << i;
-    }
-    return static_cast<unsigned>(nBits);
-}
-inline unsigned MapBits(const std::uint64_t* panBits, F64 place) {
-    std::int64_t anPlace[kLanes];
-    StoreIntegers(anPlace, place);
-    return MapBits(panBits, anPlace);
-}
-
 // Which of the windows of eight pixels hold no mask byte of 0.
 inline unsigned WholeBits(const MaskWindow& oWindow, const std::int64_t* panWindow) {
     if (oWindow.panWhole != nullptr) {
@@ -158,51 +143,50 @@ inline unsigned UsableBits(const MaskWindow& oWindow, const std::int64_t* panNea
                                : ~ByteBits(oWindow.pabyNearest, panNearest, 0);
 }
 
-// Writes what becomes of groups of eight pixels, as bits, and keeps the set of it.
+// Writes what becomes of groups of eight pixels, and keeps the set of it. Pixels are bits; those of
+// each class have a byte of a word.
 struct ClassWriter {
     ClassWriter(const MaskWindow& oWindow, int nNumPix) : nPix(nNumPix) {
-        unsigned char abyWritten[4] = {0, 1, 2, 3};
         if (oWindow.pabyModeOfClass != nullptr) {
             __builtin_memcpy(abyWritten, oWindow.pabyModeOfClass, sizeof abyWritten);
         }
         for (int k = 0; k < 4; ++k) {
-            anBit0[k] = (abyWritten[k] & 1) != 0 ? 0xffu : 0u;
-            anBit1[k] = (abyWritten[k] & 2) != 0 ? 0xffu : 0u;
+            const std::uint32_t nByte = 0xffu << (8 * k);
+            nBit0 |= (abyWritten[k] & 1) != 0 ? nByte : 0u;
+            nBit1 |= (abyWritten[k] & 2) != 0 ? nByte : 0u;
         }
         bNearestDecides = abyWritten[kClassFits] != abyWritten[kClassFits | kClassNear];
     }
 
-    void Write(int i, unsigned nFits, unsigned nNear, unsigned char* p) {
-        const unsigned anOfClass[4] = {~nFits & ~nNear, nFits & ~nNear, ~nFits & nNear,
-                                       nFits & nNear};
-        unsigned nBit0 = 0;
-        unsigned nBit1 = 0;
-        for (int k = 0; k < 4; ++k) {
-            nBit0 |= anOfClass[k] & anBit0[k];
-            nBit1 |= anOfClass[k] & anBit1[k];
-        }
-        StoreBits(p + i, nBit0, nBit1);
-        const unsigned nExist = nPix - i < kLanes ? (1u << (nPix - i)) - 1u : 0xffu;
-        anFound[0] |= ~nBit0 & ~nBit1 & nExist;
-        anFound[1] |= nBit0 & ~nBit1 & nExist;
-        anFound[2] |= ~nBit0 & nBit1 & nExist;
-        anFound[3] |= nBit0 & nBit1 & nExist;
+    void Write(int i, std::uint32_t nFits, std::uint32_t nNear, unsigned char* p) {
+        nFits &= 0xffu;
+        nNear &= 0xffu;
+        const std::uint32_t nBoth = nFits & nNear;
+        const std::uint32_t nClasses =
+            ((nFits | nNear) ^ 0xffu) | (nFits ^ nBoth) << 8 | (nNear ^ nBoth) << 16 | nBoth << 24;
+        const auto fnFold = [](std::uint32_t n) {
+            n |= n >> 16;
+            return (n | n >> 8) & 0xffu;
+        };
+        StoreBits(p + i, fnFold(nClasses & nBit0), fnFold(nClasses & nBit1));
+        const std::uint32_t nExist = nPix - i < kLanes ? (1u << (nPix - i)) - 1u : 0xffu;
+        nFound |= nClasses & nExist * 0x01010101u;
     }
 
     unsigned GetSet() const {
         unsigned nSet = 0;
         for (int k = 0; k < 4; ++k) {
-            nSet |= anFound[k] != 0 ? 1u << k : 0u;
+            nSet |= (nFound >> (8 * k) & 0xffu) != 0 ? 1u << abyWritten[k] : 0u;
         }
         return nSet;
     }
 
     int nPix;
-    // Which classes have the bits 0 and 1 of what is written.
-    unsigned anBit0[4];
-    unsigned anBit1[4];
+    unsigned char abyWritten[4] = {0, 1, 2, 3};
+    std::uint32_t nBit0 = 0;  // the classes for which bit 0 is written
+    std::uint32_t nBit1 = 0;
+    std::uint32_t nFound = 0;
     bool bNearestDecides;  // about pixels whose windows are whole
-    unsigned anFound[4] = {};
 };
 
 VETRA_STAGE unsigned MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,

@@ -226,6 +226,9 @@ using StoreFunction = void (*)(const double* padfValue, int nPix, const void* pL
 /// Copies the pixels at panOffset, all channels, to pTgt.
 using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
                               void* pTgt);
+/// Writes nPix pixels of three or four channels, whose samples lie in arrays of kSpanArray one
+/// behind the other.
+using InterleaveFunction = void (*)(const void* pSamples, int nPix, void* pTgt);
 /// Clamps samples of an integer type in place.
 using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void* pLimits);
 
@@ -346,6 +349,8 @@ struct LevelStages {
     /// With 0 in the place of negative samples.
     NearestFunction apfnNonNegativeNearest[kNumSampleTypes];
     StoreFunction apfnStore[kNumSampleTypes];
+    /// Of three and of four channels.
+    InterleaveFunction apfnInterleave[2][kNumSampleTypes];
     /// Null for the types whose samples may change on their way through a double.
     CopyFunction apfnCopy[kNumSampleTypes];
     ClampFunction apfnClamp[kNumSampleTypes];

@@ -19,6 +19,7 @@
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
+//   MapBits                      bits: which of eight numbers a map of bits has
 //   EqualBits                    bits: which of 64 bytes have a value
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
@@ -49,7 +50,7 @@ namespace vetra::utils::engine::VETRA_LEVEL {
 
 namespace {
 
-#include "vetra/base/utils/resample/engine/divisor_inl.h"
+#include "vetra/base/utils/resample/engine/scalars_inl.h"
 #include VETRA_LANES
 
 // In this order: each uses names of those before it.
@@ -105,6 +106,7 @@ namespace {
 #define VETRA_NEAREST(T) &NearestValues<T, false>
 #define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
+#define VETRA_INTERLEAVE(kNumChan, T) &Interleave<kNumChan, T>
 #define VETRA_COPY(T) &CopyPixels<T>
 #define VETRA_CLAMP(T) &ClampSamples<T>
 
@@ -140,6 +142,7 @@ const LevelStages kStages = {
     VETRA_PER_TYPE(VETRA_NEAREST),
     VETRA_PER_TYPE(VETRA_NONNEGATIVE),
     VETRA_PER_TYPE(VETRA_STORE),
+    {VETRA_PER_TYPE(VETRA_INTERLEAVE, 3, ), VETRA_PER_TYPE(VETRA_INTERLEAVE, 4, )},
     VETRA_PER_SHORT_INTEGER(VETRA_COPY),
     VETRA_PER_SHORT_INTEGER(VETRA_CLAMP),
 };

@@ -75,6 +75,17 @@ VETRA_STAGE void StoreValues(const double* padfValue, int nPix, const void* pLim
     }
 }
 
+template <int kNumChan, typename T>
+VETRA_STAGE void Interleave(const void* pSamples, int nPix, void* pTgt) {
+    const T* __restrict p = static_cast<const T*>(pSamples);
+    T* __restrict t = static_cast<T*>(pTgt);
+    for (int i = 0; i < nPix; ++i) {
+        for (int c = 0; c < kNumChan; ++c) {
+            t[i * kNumChan + c] = p[c * kSpanArray + i];
+        }
+    }
+}
+
 template <typename T>
 VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
                             void* pTgt) {

@@ -1,5 +1,7 @@
-// An integer divisor and its reciprocal in two parts, by which some lane layers divide. Included
-// inside a level's namespace; see stages_inl.h.
+// What lane layers have in common that isn't done in lanes. Included inside a level's namespace;
+// see stages_inl.h.
+
+// An integer divisor and its reciprocal in two parts, by which some lane layers divide.
 struct Divisor {
     double dfValue;
     double dfHigh;  // 1 / dfValue, rounded down to a double
@@ -39,4 +41,14 @@ inline bool AnySmallNumber(const Number (&x)[N]) {
         nSmall += __builtin_fabs(adf[i]) < 0x1p-511 && adf[i] != 0.0 ? 1 : 0;
     }
     return nSmall != 0;
+}
+
+// Bits of eight numbers, set where a map has a bit at that number.
+inline unsigned PickBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    std::uint64_t nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        const std::int64_t n = panPlace[i];
+        nBits |= (panMap[n >> 6] >> (n & 63) & 1u) << i;
+    }
+    return static_cast<unsigned>(nBits);
 }
