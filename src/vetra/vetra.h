@@ -3,6 +3,11 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/math/convexhull.h"
+#include "vetra/base/utils/math/interpgrid.h"
+#include "vetra/base/utils/math/interpolation.h"
+#include "vetra/base/utils/math/poly1d.h"
+#include "vetra/base/utils/math/poly2d.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
