@@ -117,22 +117,28 @@ Points PlainWrap(const Points& voPoints) {
 
 TEST(ConvexHull, NearlyCollinearPointsEnd) {
     std::mt19937_64 oEngine(23);
-    std::uniform_real_distribution<double> oRange(0.0, 1.0);
-    std::uniform_int_distribution<int> oBits(-2, 2);
+    std::uniform_real_distribution<double> oSlope(0.5, 1.0);
+    std::uniform_int_distribution<int> oRange(1, 1 << 20);
     int nOpen = 0;
     for (int nSet = 0; nSet < 4000; ++nSet) {
-        const double dfSlope = oRange(oEngine);
+        const double dfSlope = oSlope(oEngine);
         Points voPoints(3 + static_cast<std::size_t>(nSet % 20));
+        Points voWhole;  // the same in units that make the rounded heights whole numbers
         for (Point& o : voPoints) {
-            // Whole numbers of 53 bits, on a line but for the last bits.
-            const double x = std::floor(std::ldexp(1.0 + oRange(oEngine), 52));
-            o = {x, std::floor(x * dfSlope) + oBits(oEngine)};
+            const int x = oRange(oEngine);
+            o = {x, x * dfSlope};
+            voWhole.emplace_back(x, std::ldexp(o.second, 53));
         }
-        const Points voWrap = PlainWrap(voPoints);
-        nOpen += voWrap.empty();
-        ASSERT_EQ(Hull(voPoints), voWrap.empty() ? PlainHull(voPoints) : voWrap) << nSet;
+        Points voHull = PlainWrap(voPoints);
+        if (voHull.empty()) {
+            ++nOpen;
+            for (const Point& o : PlainHull(voWhole)) {
+                voHull.emplace_back(o.first, std::ldexp(o.second, -53));
+            }
+        }
+        ASSERT_EQ(Hull(voPoints), voHull) << nSet;
     }
-    EXPECT_GT(nOpen, 40);
+    EXPECT_GT(nOpen, 400);
 }
 
 TEST(ConvexHull, ManyVertices) {
