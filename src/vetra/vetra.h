@@ -3,7 +3,12 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/math/convexhull.h"
+#include "vetra/base/utils/math/interpgrid.h"
+#include "vetra/base/utils/math/interpolation.h"
 #include "vetra/base/utils/math/matrices.h"
+#include "vetra/base/utils/math/poly1d.h"
+#include "vetra/base/utils/math/poly2d.h"
 #include "vetra/base/utils/math/rotations/quaternion.h"
 #include "vetra/base/utils/math/rotations/quatfunctions.h"
 #include "vetra/base/utils/math/rotations/rotations.h"
