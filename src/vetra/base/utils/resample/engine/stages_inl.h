@@ -42,9 +42,14 @@
 
 static_assert(FLT_EVAL_METHOD == 0, "double arithmetic must be done in double");
 
-// A stage is one function: with so many of them in a source, compilers stop inlining lane
-// operations at some point.
+// A stage is one function: with so many of them in a source, GCC stops inlining lane operations at
+// some point. Plain processors have more operations for each lane operation, which would take long
+// to compile and gain little.
+#if defined(__GNUC__) && !defined(__clang__) && defined(__AVX2__)
 #define VETRA_STAGE [[gnu::flatten]]
+#else
+#define VETRA_STAGE
+#endif
 
 namespace vetra::utils::engine::VETRA_LEVEL {
 
