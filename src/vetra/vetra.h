@@ -3,6 +3,11 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/math/fourier/cdft.h"
+#include "vetra/base/utils/math/fourier/complexdft.h"
+#include "vetra/base/utils/math/fourier/fftcomplex.h"
+#include "vetra/base/utils/math/hostdensify.h"
+#include "vetra/base/utils/math/sincos.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
