@@ -9,7 +9,7 @@ declare -A groups=(
     [tests]="clang libclang-rt-dev libomp-dev libgtest-dev pkg-config"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
-    [bench]="libbenchmark-dev libopencv-dev"
+    [bench]="libbenchmark-dev libfftw3-dev libopencv-dev"
 )
 
 missing=()
