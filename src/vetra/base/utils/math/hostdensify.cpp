@@ -17,7 +17,7 @@ namespace {
 
 using std::int64_t;
 
-constexpr int kStripCols = 1024;
+constexpr int kStripCols = 4096;
 
 // The known position at or before n, the next one, and how far n is between them.
 struct Interval {
