@@ -101,7 +101,7 @@ void HostDensify(float* data, const int& rows, const int& cols, const int& rowSt
     const int nColStep = colStep;
     const int64_t nBands = (nRows - 1) / nRowStep + 1;
     const int64_t nStrips = (nCols - 1) / kStripCols + 1;
-    const auto fnRow = [=](int nRow) { return data + static_cast<std::size_t>(nRow) * nCols; };
+    const auto fnRow = [=](int nRow) { return data + std::ptrdiff_t{nRow} * nCols; };
 #pragma omp parallel
     {
         Strip oStrip;
