@@ -9,7 +9,7 @@ declare -A groups=(
     [tests]="clang libclang-rt-dev libomp-dev libgtest-dev libeigen3-dev pkg-config"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
-    [bench]="libbenchmark-dev libopencv-dev libeigen3-dev"
+    [bench]="libbenchmark-dev libopencv-dev libeigen3-dev libfftw3-dev libgeographiclib-dev"
 )
 
 missing=()

@@ -4,6 +4,10 @@
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/math/convexhull.h"
+#include "vetra/base/utils/math/fourier/cdft.h"
+#include "vetra/base/utils/math/fourier/complexdft.h"
+#include "vetra/base/utils/math/fourier/fftcomplex.h"
+#include "vetra/base/utils/math/hostdensify.h"
 #include "vetra/base/utils/math/interpgrid.h"
 #include "vetra/base/utils/math/interpolation.h"
 #include "vetra/base/utils/math/matrices.h"
@@ -12,6 +16,7 @@
 #include "vetra/base/utils/math/rotations/quaternion.h"
 #include "vetra/base/utils/math/rotations/quatfunctions.h"
 #include "vetra/base/utils/math/rotations/rotations.h"
+#include "vetra/base/utils/math/sincos.h"
 #include "vetra/base/utils/math/vectors.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
