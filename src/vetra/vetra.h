@@ -3,6 +3,9 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/geo/ellipcalc.h"
+#include "vetra/base/utils/geo/geodesy.h"
+#include "vetra/base/utils/geo/solarposition.h"
 #include "vetra/base/utils/resample/algorithm/averageresampler.h"
 #include "vetra/base/utils/resample/algorithm/bilinearresampler.h"
 #include "vetra/base/utils/resample/algorithm/cplxsarcoeffs.h"
