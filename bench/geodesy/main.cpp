@@ -111,7 +111,8 @@ std::vector<Case> AllCases() {
     return voCases;
 }
 
-/// Prints the medians of benchmarks named "work/library": nanoseconds per point.
+/// Prints the medians of benchmarks named "work/library": nanoseconds of processor time
+/// per point.
 class TableReporter : public benchmark::BenchmarkReporter {
  public:
     bool ReportContext(const Context&) override { return true; }
@@ -122,7 +123,7 @@ class TableReporter : public benchmark::BenchmarkReporter {
             const std::size_t nSlash = sName.rfind('/');
             if (oRun.run_type == Run::RT_Aggregate && oRun.aggregate_name == "median") {
                 moTimes[sName.substr(0, nSlash)][sName.substr(nSlash + 1)] =
-                    oRun.GetAdjustedRealTime() / kPoints;
+                    oRun.GetAdjustedCPUTime() / kPoints;
             }
         }
     }
@@ -164,9 +165,9 @@ int main(int argc, char** argv) {
     }
     std::vector<char*> vpszArguments(argv, argv + argc);
     // Short runs in random order, so that a busy moment of the machine hits all libraries alike.
-    std::string asDefaults[] = {"--benchmark_repetitions=9",
+    std::string asDefaults[] = {"--benchmark_repetitions=31",
                                 "--benchmark_enable_random_interleaving=true",
-                                "--benchmark_min_time=0.02"};
+                                "--benchmark_min_time=0.005"};
     for (std::string& sDefault : asDefaults) {
         vpszArguments.insert(vpszArguments.begin() + 1, sDefault.data());
     }

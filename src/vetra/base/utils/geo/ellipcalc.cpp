@@ -99,7 +99,9 @@ double EllipCalc::MeridianRadius(double dfLat) const {
 }
 
 double EllipCalc::PrimeVerticalRadius(double dfLat) const {
-    return PrimeVerticalRadius(std::sin(dfLat), std::cos(dfLat));
+    double s, c;
+    SinCos(dfLat, s, c);
+    return PrimeVerticalRadius(s, c);
 }
 
 double EllipCalc::PrimeVerticalRadius(double dfSinLat, double dfCosLat) const {
@@ -109,13 +111,7 @@ double EllipCalc::PrimeVerticalRadius(double dfSinLat, double dfCosLat) const {
 
 void EllipCalc::GeoToXYZ(double dfLon, double dfLat, double dfHgt, double& X, double& Y,
                          double& Z) const {
-    const double s = std::sin(dfLat);
-    const double c = std::cos(dfLat);
-    const double N = PrimeVerticalRadius(s, c);
-    const double t = (N + dfHgt) * c;
-    X = t * std::cos(dfLon);
-    Y = t * std::sin(dfLon);
-    Z = (N * axisRatioSq + dfHgt) * s;
+    GeoToEarthFixed(dfLon, dfLat, dfHgt, semiMajorSq, semiMinorSq, axisRatioSq, X, Y, Z);
 }
 
 void EllipCalc::XYZToGeo(double X, double Y, double Z, double& dfLon, double& dfLat,
@@ -170,11 +166,10 @@ double EllipCalc::NewtonTanLat(double p, double Z, double dfGuess) const {
     double t = dfGuess;
     for (int n = 0; n < kMaxIterations; ++n) {
         const double w = p * t - Z;
-        const double v = w * (t * t + dfInvC);
-        const double gt = g * t;
-        const double f = w * v - gt * t;
-        const double dfHalfSlope = p * v + t * (w * w) - gt;
-        const double dfStep = f / (2.0 * dfHalfSlope);
+        const double q = t * t + dfInvC;
+        const double f = w * w * q - g * t * t;
+        const double dfHalfSlope = w * (p * q + w * t) - g * t;
+        const double dfStep = 0.5 * f / dfHalfSlope;
         // On a sphere the guess is exact, a double root: 0 / 0.
         if (!std::isfinite(dfStep)) {
             break;

@@ -12,15 +12,8 @@ void GeoToXYZ(double dfLon, double dfLat, double dfHgt, double a, double e2, dou
         X = Y = Z = 0.0;
         return;
     }
-    const double c = std::cos(dfLat);
-    const double s = std::sin(dfLat);
-    const double a2 = a * a;
-    const double b2 = (1.0 - e2) * a2;
-    const double N = a2 / std::sqrt(b2 * (s * s) + a2 * (c * c));
-    const double t = (N + dfHgt) * c;
-    X = t * std::cos(dfLon);
-    Y = t * std::sin(dfLon);
-    Z = (N * (1.0 - e2) + dfHgt) * s;
+    const double k = 1.0 - e2;
+    GeoToEarthFixed(dfLon, dfLat, dfHgt, a * a, k * (a * a), k, X, Y, Z);
 }
 
 void GeoToXYZ(const double* padfGeo, double a, double e2, double* padfXyz) {
@@ -45,14 +38,14 @@ void XYZToGeo(double X, double Y, double Z, double a, double e2, double& dfLon, 
     double x = k * p;
     double dfPrevious = 0.0;
     for (int n = 0; n < kMaxIterations; ++n) {
-        const double r = 1.0 / std::sqrt(x * x + Z * Z);
-        const double s = Z * r;
-        const double c = x * r;
-        const double dfRoot = std::sqrt(a2 * (c * c) + b2 * (s * s));
-        const double N = a2 / dfRoot;
-        // p / c - N in a form that keeps its digits near a pole; see CloseLatHgt.
-        const double h = p * c + Z * s - dfRoot;
-        x = (1.0 - N * e2 / (h + N)) * p;
+        // With the latitude's sine Z r and cosine x r: p / c - N in a form that keeps its digits
+        // near a pole (see CloseLatHgt), and N = a^2 / dfRoot.
+        const double dfInvSq = 1.0 / (x * x + Z * Z);
+        const double u = std::sqrt(a2 * (x * x) + b2 * (Z * Z));
+        const double w = p * x + Z * Z - u;
+        const double h = w * std::sqrt(dfInvSq);
+        // N e2 / (h + N), of which dfInvSq w u is h dfRoot.
+        x = (1.0 - e2 * a2 / (w * u * dfInvSq + a2)) * p;
         // Ends at NaN as well.
         if (!(std::abs(h - dfPrevious) > kHgtTol)) {
             break;

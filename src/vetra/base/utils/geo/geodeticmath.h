@@ -4,6 +4,8 @@
 #include <algorithm>
 #include <cmath>
 
+#include "vetra/base/utils/geo/trigonometry.h"
+
 /// What `EllipCalc` and the free functions share. Lengths are in metres, angles in radians; a and b
 /// are the semi-axes, e2 is the first eccentricity squared.
 namespace vetra::utils::geo {
@@ -19,15 +21,42 @@ inline double PolarAngle(double x, double y) {
     if (y == 0.0) {
         return x >= 0.0 ? 0.0 : (x < 0.0 ? kPi : x);
     }
-    const double dfAngle = std::atan2(y, x);
+    const double dfAngle = Atan2(y, x);
     return dfAngle == -kPi ? kPi : dfAngle;
 }
 
 /// The latitude on the axis: north at the centre, NaN for NaN.
 inline double PoleLatitude(double Z) { return Z >= 0.0 ? kHalfPi : (Z < 0.0 ? -kHalfPi : Z); }
 
-/// Latitude and height from a latitude that is nearly right, given by its tangent y / x with x >=
-/// 0.
+/// a + b as a rounded sum and what its rounding left (Knuth).
+inline void TwoSum(double a, double b, double& dfSum, double& dfRest) {
+    dfSum = a + b;
+    const double dfPart = dfSum - a;
+    dfRest = (a - (dfSum - dfPart)) + (b - dfPart);
+}
+
+/// Earth-fixed coordinates of geodetic ones, X = (N + h) cos(lat) cos(lon) and so on. What the
+/// rounding of sums, sines and cosines leaves is carried along: at 40000 km, where a unit in the
+/// last place is 7 nm, it would add up.
+///
+/// \param a2, b2, dfRatioSq  a^2, b^2 and b^2 / a^2
+inline void GeoToEarthFixed(double dfLon, double dfLat, double dfHgt, double a2, double b2,
+                            double dfRatioSq, double& X, double& Y, double& Z) {
+    double sL, cL, sLRest, cLRest, s, c, sRest, cRest;
+    SinCos(dfLon, sL, cL, sLRest, cLRest);
+    SinCos(dfLat, s, c, sRest, cRest);
+    const double N = a2 / std::sqrt(b2 * (s * s) + a2 * (c * c));
+    double R, RRest, V, VRest;
+    TwoSum(N, dfHgt, R, RRest);
+    TwoSum(N * dfRatioSq, dfHgt, V, VRest);
+    const double t = R * c;
+    const double tRest = R * cRest + RRest * c;
+    X = t * cL + (t * cLRest + tRest * cL);
+    Y = t * sL + (t * sLRest + tRest * sL);
+    Z = V * s + (V * sRest + VRest * s);
+}
+
+/// Latitude and height from a latitude that is nearly right, given by its tangent y / x.
 ///
 /// One step of Bowring's iteration ("Transformation from spatial to geographical coordinates",
 /// Survey Review 23, 1976) squares the latitude's error, which makes it as exact as doubles are
@@ -41,23 +70,25 @@ inline void CloseLatHgt(double p, double Z, double y, double x, double a, double
     const double q = 1.0 / std::sqrt(u * u + v * v);
     const double cb = u * q;
     const double sb = v * q;
-    const double dfNum = Z + e2 * a * (a / b) * (sb * sb * sb);
-    // Below 0 only deep inside, where several normals meet.
-    const double dfDen = std::max(p - e2 * a * (cb * cb * cb), 0.0);
-    const double r = 1.0 / std::sqrt(dfNum * dfNum + dfDen * dfDen);
-    const double s = dfNum * r;
-    const double c = dfDen * r;
-    dfLat = std::atan2(dfNum, dfDen);
-    dfHgt = p * c + Z * s - std::sqrt(b * b * (s * s) + a * a * (c * c));
+    double dfNum = Z + e2 * a * (a / b) * (sb * sb * sb);
+    double dfDen = p - e2 * a * (cb * cb * cb);
+    if (!(dfDen > 0.0)) {  // deep inside, where several normals meet
+        dfNum = y;
+        dfDen = std::abs(x);
+    }
+    const double dfNumSq = dfNum * dfNum;
+    const double dfDenSq = dfDen * dfDen;
+    const double r = 1.0 / std::sqrt(dfNumSq + dfDenSq);
+    dfLat = Atan2(dfNum, dfDen);
+    dfHgt = p * (dfDen * r) + Z * (dfNum * r) - std::sqrt(b * b * dfNumSq + a * a * dfDenSq) * r;
 }
 
 /// Fills a rotation, row-major, whose columns are the directions east, north and up at a longitude
 /// and latitude. Element 6 is exactly 0.
 inline void FillLocalAxes(double dfLon, double dfLat, double* padfM) {
-    const double sL = std::sin(dfLon);
-    const double cL = std::cos(dfLon);
-    const double sP = std::sin(dfLat);
-    const double cP = std::cos(dfLat);
+    double sL, cL, sP, cP;
+    SinCos(dfLon, sL, cL);
+    SinCos(dfLat, sP, cP);
     padfM[0] = -sL;
     padfM[1] = -sP * cL;
     padfM[2] = cP * cL;
