@@ -103,15 +103,14 @@ TEST(Conversions, ForwardWithin15nm) {
                 std::clamp(static_cast<double>(g.y / kPreciseRadPerDeg), -90.0, 90.0);
             double X, Y, Z;
             oTruth.Forward(dfLatDeg, dfLonDeg, g.z, X, Y, Z);
-            const PrecisePoint oMoved = oExact - PreciseXyz(dfLonDeg * kPreciseRadPerDeg,
-                                                            dfLatDeg * kPreciseRadPerDeg, g.z);
-            dfWorstTruth = std::max(dfWorstTruth, Length(oOurs - (PrecisePoint{X, Y, Z} + oMoved)));
+            const PrecisePoint oTheirs = {X, Y, Z};
+            dfWorstTruth = std::max(
+                dfWorstTruth, Length(oTheirs - PreciseXyz(dfLonDeg * kPreciseRadPerDeg,
+                                                          dfLatDeg * kPreciseRadPerDeg, g.z)));
         }
         EXPECT_LE(dfWorst, 1.5e-8) << oForward.sName;
-        EXPECT_LE(dfWorstTruth, 1.5e-8) << oForward.sName;
+        EXPECT_LE(dfWorstTruth, 1.5e-8) << "the yardstick itself, beside GeographicLib";
         RecordProperty(oForward.sName + " forward, nm", std::to_string(dfWorst * 1e9));
-        RecordProperty(oForward.sName + " forward beside GeographicLib, nm",
-                       std::to_string(dfWorstTruth * 1e9));
     }
 }
 
@@ -182,9 +181,9 @@ TEST(Conversions, InverseWithin20nmAndOneTenthOfAMicrometreHighUp) {
 
 TEST(Conversions, InverseOnOtherEllipsoids) {
     // A sphere, on which Newton's first guess is exact, and one flatter than Saturn.
-    for (const double e2 : {0.0, 1e-12, 0.2}) {
+    for (const double e2 : {0.0, 1e-12, 0.2, 0.6}) {
         for (const Converter& oInverse : Inverses(kA, e2)) {
-            for (const double h : {-1e4, 0.0, 8e5, 5e6}) {
+            for (const double h : {-1e4, 0.0, 3e4, 8e5, 5e6}) {
                 for (int nLat = -90; nLat <= 90; ++nLat) {
                     const PrecisePoint p = PreciseXyz(2.5L, nLat * kPreciseRadPerDeg, h, kA, e2);
                     const double X = static_cast<double>(p.x);

@@ -32,21 +32,31 @@ TEST(Trigonometry, WithinTwoUlps) {
         vdfValues.insert(vdfValues.end(), {df, std::nextafter(df, 1e9), std::nextafter(df, -1e9)});
     }
     double dfWorst = 0.0;
+    double dfWorstSum = 0.0;
     double dfWorstAngle = 0.0;
     for (std::size_t i = 0; i < vdfValues.size(); ++i) {
         const double x = vdfValues[i];
-        double s, c;
-        SinCos(x, s, c);
-        dfWorst = std::max({dfWorst, Ulps(s, std::sin(static_cast<long double>(x))),
-                            Ulps(c, std::cos(static_cast<long double>(x)))});
         const double y = vdfValues[(i * 7919 + 13) % vdfValues.size()];
+        const SinCosPair o = SinCos(x, y);
+        for (const int n : {0, 1}) {
+            const long double dfAngle = n == 0 ? x : y;
+            const long double s = std::sin(dfAngle);
+            const long double c = std::cos(dfAngle);
+            dfWorst = std::max({dfWorst, Ulps(o.s[n], s), Ulps(o.c[n], c)});
+            dfWorstSum = std::max(
+                {dfWorstSum,
+                 static_cast<double>(std::abs(s - o.s[n] - static_cast<long double>(o.sRest[n]))),
+                 static_cast<double>(std::abs(c - o.c[n] - static_cast<long double>(o.cRest[n])))});
+        }
         dfWorstAngle =
             std::max(dfWorstAngle, Ulps(Atan2(y, x), std::atan2(static_cast<long double>(y),
                                                                 static_cast<long double>(x))));
     }
     EXPECT_LT(dfWorst, 1.0);
+    EXPECT_LT(dfWorstSum, 5e-17);  // of sums with their rests
     EXPECT_LT(dfWorstAngle, 2.0);
     RecordProperty("sine and cosine, ulps", std::to_string(dfWorst));
+    RecordProperty("sine and cosine with their rests", std::to_string(dfWorstSum * 1e17));
     RecordProperty("angle, ulps", std::to_string(dfWorstAngle));
 }
 
@@ -65,10 +75,11 @@ TEST(Trigonometry, OddInputs) {
                                              std::signbit(df) == std::signbit(dfExpected))
                 << y << ' ' << x << ": " << df;
         }
-        double s, c;
-        SinCos(x, s, c);
-        EXPECT_TRUE(std::isfinite(x) ? s == std::sin(x) && c == std::cos(x)
-                                     : std::isnan(s) && std::isnan(c))
+        const SinCosPair o = SinCos(1.0, x);
+        EXPECT_NEAR(o.s[0], std::sin(1.0), 2e-16) << x;
+        EXPECT_TRUE(std::isfinite(x) ? std::abs(o.s[1] - std::sin(x)) < 2e-16 &&
+                                           std::abs(o.c[1] - std::cos(x)) < 2e-16
+                                     : std::isnan(o.s[1]) && std::isnan(o.c[1]))
             << x;
     }
 }

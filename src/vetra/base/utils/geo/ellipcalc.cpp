@@ -1,6 +1,5 @@
-// Earth-fixed to geodetic: Newton's method on a quartic in t = tan(latitude), after which one step
-// of another iteration (`CloseLatHgt`) makes the latitude exact. Its first guess is the exact
-// answer on the surface, and it needs 3 steps near the surface and 7 at 40000 km.
+// Earth-fixed to geodetic: Newton's method on a quartic in t = tan(latitude), three steps from the
+// surface to any height.
 
 #include "vetra/base/utils/geo/ellipcalc.h"
 
@@ -99,9 +98,7 @@ double EllipCalc::MeridianRadius(double dfLat) const {
 }
 
 double EllipCalc::PrimeVerticalRadius(double dfLat) const {
-    double s, c;
-    SinCos(dfLat, s, c);
-    return PrimeVerticalRadius(s, c);
+    return PrimeVerticalRadius(std::sin(dfLat), std::cos(dfLat));
 }
 
 double EllipCalc::PrimeVerticalRadius(double dfSinLat, double dfCosLat) const {
@@ -111,7 +108,7 @@ double EllipCalc::PrimeVerticalRadius(double dfSinLat, double dfCosLat) const {
 
 void EllipCalc::GeoToXYZ(double dfLon, double dfLat, double dfHgt, double& X, double& Y,
                          double& Z) const {
-    GeoToEarthFixed(dfLon, dfLat, dfHgt, semiMajorSq, semiMinorSq, axisRatioSq, X, Y, Z);
+    GeoToEarthFixed(dfLon, dfLat, dfHgt, semiMajor, eccSq, X, Y, Z);
 }
 
 void EllipCalc::XYZToGeo(double X, double Y, double Z, double& dfLon, double& dfLat,
@@ -141,8 +138,7 @@ void EllipCalc::LatHgt(double p2, double Z, bool bPoleForm, double& dfLat, doubl
         dfHgt = p - semiMajor;
         return;
     }
-    const double dfGuess = Z / (oneMinusEccSq * p);
-    if (bPoleForm && std::abs(dfGuess) >= 1e7) {
+    if (bPoleForm && std::abs(Z) >= 1e7 * (oneMinusEccSq * p)) {
         // The angle from the pole, seen from the pole's centre of curvature, and the little that
         // the surface has fallen by then.
         const double h = std::abs(Z) - semiMinor;
@@ -152,18 +148,21 @@ void EllipCalc::LatHgt(double p2, double Z, bool bPoleForm, double& dfLat, doubl
         return;
     }
     // Beyond 1e100 nothing changes any more, but squares would overflow.
-    const double t = std::clamp(NewtonTanLat(p, Z, dfGuess), -1e100, 1e100);
-    CloseLatHgt(p, Z, t, 1.0, semiMajor, semiMinor, eccSq, dfLat, dfHgt);
+    const double t = std::clamp(NewtonTanLat(p, Z), -1e100, 1e100);
+    dfLat = Atan2(t, 1.0);
+    // The length of the projection on the normal, p cos(lat) + Z sin(lat) - a^2 / N: p / cos(lat) -
+    // N would divide one vanishing number by another near a pole.
+    dfHgt = (p + Z * t - std::sqrt(semiMajorSq + semiMinorSq * (t * t))) / std::sqrt(1.0 + t * t);
 }
 
 // The quartic f(t) = p2 t^4 + k1 t^3 + k2 t^2 + k3 t + k4, with k1 = -2 p Z, k2 = (p2 - e^4 a^2) /
 // c
 // + Z^2, k3 = k1 / c, k4 = Z^2 / c and c = 1 - e^2, in the form w^2 (t^2 + 1 / c) - e^4 a^2 / c t^2
 // with w = p t - Z, which doesn't subtract nearly equal products of large numbers.
-double EllipCalc::NewtonTanLat(double p, double Z, double dfGuess) const {
+double EllipCalc::NewtonTanLat(double p, double Z) const {
     const double dfInvC = 1.0 / oneMinusEccSq;
     const double g = eccFourth * semiMajorSq * dfInvC;
-    double t = dfGuess;
+    double t = Z / GuessAxisPart(p, Z, semiMajor, eccSq);
     for (int n = 0; n < kMaxIterations; ++n) {
         const double w = p * t - Z;
         const double q = t * t + dfInvC;
@@ -175,8 +174,9 @@ double EllipCalc::NewtonTanLat(double p, double Z, double dfGuess) const {
             break;
         }
         t -= dfStep;
-        // Close to a pole the tangent's own rounding is larger than 1e-10.
-        if (std::abs(dfStep) <= std::max(1e-10, 2.0 * kEpsilon * std::abs(t))) {
+        // Relative, as 1e-10 is millimetres at great height for a small t, and less than a unit in
+        // the last place for a large one.
+        if (std::abs(dfStep) <= 1e-10 * std::abs(t)) {
             break;
         }
     }

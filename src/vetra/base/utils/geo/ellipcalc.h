@@ -143,7 +143,7 @@ class VETRA_EXPORT EllipCalc {
     /// \param bPoleForm  a closed form takes the place of the iteration very close to a pole
     void LatHgt(double p2, double Z, bool bPoleForm, double& dfLat, double& dfHgt) const;
     /// Newton's method for the tangent of the latitude.
-    double NewtonTanLat(double p, double Z, double dfGuess) const;
+    double NewtonTanLat(double p, double Z) const;
 
     double semiMajor;
     double eccSq;

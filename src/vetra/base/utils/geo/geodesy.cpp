@@ -12,8 +12,7 @@ void GeoToXYZ(double dfLon, double dfLat, double dfHgt, double a, double e2, dou
         X = Y = Z = 0.0;
         return;
     }
-    const double k = 1.0 - e2;
-    GeoToEarthFixed(dfLon, dfLat, dfHgt, a * a, k * (a * a), k, X, Y, Z);
+    GeoToEarthFixed(dfLon, dfLat, dfHgt, a, e2, X, Y, Z);
 }
 
 void GeoToXYZ(const double* padfGeo, double a, double e2, double* padfXyz) {
@@ -35,7 +34,7 @@ void XYZToGeo(double X, double Y, double Z, double a, double e2, double& dfLon, 
         dfHgt = std::abs(Z) - b;
         return;
     }
-    double x = k * p;
+    double x = GuessAxisPart(p, Z, a, e2);
     double dfPrevious = 0.0;
     for (int n = 0; n < kMaxIterations; ++n) {
         // With the latitude's sine Z r and cosine x r: p / c - N in a form that keeps its digits

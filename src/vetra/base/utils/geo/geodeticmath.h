@@ -38,22 +38,28 @@ inline void TwoSum(double a, double b, double& dfSum, double& dfRest) {
 /// Earth-fixed coordinates of geodetic ones, X = (N + h) cos(lat) cos(lon) and so on. What the
 /// rounding of sums, sines and cosines leaves is carried along: at 40000 km, where a unit in the
 /// last place is 7 nm, it would add up.
-///
-/// \param a2, b2, dfRatioSq  a^2, b^2 and b^2 / a^2
-inline void GeoToEarthFixed(double dfLon, double dfLat, double dfHgt, double a2, double b2,
-                            double dfRatioSq, double& X, double& Y, double& Z) {
-    double sL, cL, sLRest, cLRest, s, c, sRest, cRest;
-    SinCos(dfLon, sL, cL, sLRest, cLRest);
-    SinCos(dfLat, s, c, sRest, cRest);
-    const double N = a2 / std::sqrt(b2 * (s * s) + a2 * (c * c));
+inline void GeoToEarthFixed(double dfLon, double dfLat, double dfHgt, double a, double e2,
+                            double& X, double& Y, double& Z) {
+    const SinCosPair o = SinCos(dfLon, dfLat);
+    const double s = o.s[1];
+    const double c = o.c[1];
+    const double N = a / std::sqrt(1.0 - e2 * (s * s));
     double R, RRest, V, VRest;
     TwoSum(N, dfHgt, R, RRest);
-    TwoSum(N * dfRatioSq, dfHgt, V, VRest);
+    TwoSum(N * (1.0 - e2), dfHgt, V, VRest);
     const double t = R * c;
-    const double tRest = R * cRest + RRest * c;
-    X = t * cL + (t * cLRest + tRest * cL);
-    Y = t * sL + (t * sLRest + tRest * sL);
-    Z = V * s + (V * sRest + VRest * s);
+    const double tRest = R * o.cRest[1] + RRest * c;
+    X = t * o.c[0] + (t * o.cRest[0] + tRest * o.c[0]);
+    Y = t * o.s[0] + (t * o.sRest[0] + tRest * o.s[0]);
+    Z = V * s + (V * o.sRest[1] + VRest * s);
+}
+
+/// The part of p in a first guess of the latitude, tan(lat) = Z / result: (1 - e2) p, which is
+/// exact on the surface, and above the sphere of radius a, where that would leave half a dozen more
+/// iterations, nearly as exact by the distance from the centre.
+inline double GuessAxisPart(double p, double Z, double a, double e2) {
+    const double r = std::sqrt(p * p + Z * Z);
+    return r > a ? p * (1.0 - e2 * a / r) : p * (1.0 - e2);
 }
 
 /// Latitude and height from a latitude that is nearly right, given by its tangent y / x.
@@ -86,9 +92,11 @@ inline void CloseLatHgt(double p, double Z, double y, double x, double a, double
 /// Fills a rotation, row-major, whose columns are the directions east, north and up at a longitude
 /// and latitude. Element 6 is exactly 0.
 inline void FillLocalAxes(double dfLon, double dfLat, double* padfM) {
-    double sL, cL, sP, cP;
-    SinCos(dfLon, sL, cL);
-    SinCos(dfLat, sP, cP);
+    const SinCosPair o = SinCos(dfLon, dfLat);
+    const double sL = o.s[0];
+    const double cL = o.c[0];
+    const double sP = o.s[1];
+    const double cP = o.c[1];
     padfM[0] = -sL;
     padfM[1] = -sP * cL;
     padfM[2] = cP * cL;
