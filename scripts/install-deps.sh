@@ -6,10 +6,10 @@ set -euo pipefail
 declare -A groups=(
     [build]="g++ cmake ninja-build"
     [tool]="libgdal-dev libcli11-dev"
-    [tests]="clang libclang-rt-dev libomp-dev libgtest-dev pkg-config"
+    [tests]="clang libclang-rt-dev libomp-dev libgtest-dev pkg-config libgeographiclib-dev"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
-    [bench]="libbenchmark-dev libopencv-dev"
+    [bench]="libbenchmark-dev libopencv-dev libgeographiclib-dev"
 )
 
 missing=()

@@ -107,9 +107,10 @@ class VETRA_EXPORT EllipCalc {
     ///
     /// At most 100 times, while the height of the point on the ray is off by more than the height
     /// tolerance, the range becomes the distance from the origin to the place at height \p dfHgt
-    /// above or below that point. This converges for a ray that is steep against the surface, the
-    /// faster the steeper; for a first guess on the far side, it may end at the far intersection.
-    /// That it has not converged is not reported: compare the height of \p padfPoint with \p dfHgt.
+    /// above or below that point. Each time shrinks the error by the squared sine of the ray's angle
+    /// from the vertical, so that 100 are enough up to about 60 degrees. Whether the tolerance was
+    /// met, and at which of two intersections, is not reported: compare the height of \p padfPoint
+    /// with \p dfHgt.
     ///
     /// \param padfOrigin     earth-fixed X, Y, Z in metres
     /// \param padfDirection  earth-fixed; should be of unit length, as it is used as given

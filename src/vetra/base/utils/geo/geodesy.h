@@ -73,8 +73,8 @@ VETRA_EXPORT int ProjectToEllipsoid(const double* padfOrigin, const double* padf
 ///
 /// The point that comes in says where on the ray to start, by its distance from the origin. While
 /// the height is off by more than a tolerance, the range becomes the distance from the origin to
-/// the place at height \p h above or below the point. This converges for a ray that is steep
-/// against the surface, the faster the steeper.
+/// the place at height \p h above or below the point. Each time shrinks the error by the squared sine of
+/// the ray's angle from the vertical.
 ///
 /// \param padfOrigin      earth-fixed X, Y, Z in metres
 /// \param padfDirection   earth-fixed, of unit length
