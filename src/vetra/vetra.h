@@ -3,6 +3,9 @@
 
 /// Every public header.
 #include "vetra/base/utils/fs/fileutils.h"
+#include "vetra/base/utils/geo/ellipcalc.h"
+#include "vetra/base/utils/geo/geodesy.h"
+#include "vetra/base/utils/geo/solarposition.h"
 #include "vetra/base/utils/math/convexhull.h"
 #include "vetra/base/utils/math/fourier/cdft.h"
 #include "vetra/base/utils/math/fourier/complexdft.h"

@@ -101,6 +101,13 @@ int main() {
           "modes");
     Check(IsNumeric(TrimWhitespace(FormatString(" %d ", 7))) && TextToDouble("7") == 7.0, "texts");
     Check(StringTokenizer("a b").CountTokens() == 2 && HashString("") == 1339080641, "tokens");
+    double adfGeo[3] = {0.1, 0.2, 3.0}, adfXyz[3], X = 0.0, Y = 0.0, Z = 0.0;
+    EllipCalc().GeoToXYZ(adfGeo[0], adfGeo[1], adfGeo[2], X, Y, Z);
+    GeoToXYZ(adfGeo, 6378137.0, 0.00669437999014, adfXyz);
+    Check(X == adfXyz[0] && Y == adfXyz[1] && Z == adfXyz[2], "geodesy");
+    float fZenith = -1.0f, fAzimuth = -1.0f;
+    SolarZenithAzimuth(2020, 6, 21, 12, 0, 0.0, 50.0f, 0.0f, fZenith, fAzimuth);
+    Check(fZenith > 26.0f && fZenith < 27.5f, "sun");
     SaveKernelFile("kernel.txt", 1, 1, 0, vdfWeights, false);
     int nKernelCols = 0, nKernelRows = 0, nSubPixels = 7;
     LoadKernelFile("kernel.txt", nKernelCols, nKernelRows, nSubPixels, vdfWeights);
