@@ -25,17 +25,13 @@ Parts Julian(int nYear, int nMonth, int nDay, int nHour = 0, int nMinute = 0, do
 
 TEST(TimeSystemConverter, JulianDates) {
     EXPECT_EQ(Julian(2000, 1, 1, 12), (Parts{2451544.5, 0.5}));
-    EXPECT_EQ(Julian(1858, 11, 17), (Parts{2400000.5, 0.0}));
     EXPECT_EQ(Julian(-4713, 11, 24, 12), (Parts{-0.5, 0.5}));
     EXPECT_EQ(Julian(1987, 6, 19, 12, 30, 15.5), (Parts{2446965.5, 45015.5 / 86400.0}));
     // Beyond the usual ranges.
     EXPECT_EQ(Julian(1999, 13, 1), Julian(2000, 1, 1));
     EXPECT_EQ(Julian(2001, -10, 0), Julian(2000, 1, 31));
-    EXPECT_EQ(Julian(2000, 2, 30), Julian(2000, 3, 1));
     for (const int n : {std::numeric_limits<int>::min(), std::numeric_limits<int>::max()}) {
-        const Parts oFar = Julian(n, n, n, n, n, 0.0);
-        EXPECT_NEAR(oFar.dfDays, n * (365.2425 + 365.2425 / 12 + 1), 2e6);
-        EXPECT_NEAR(oFar.dfFraction, n * (61.0 / 1440), 1.0);
+        EXPECT_NEAR(Julian(n, n, n, n, n).dfDays, n * (365.2425 + 365.2425 / 12 + 1), 2e6);
     }
 
     std::mt19937 oRandom(1);
@@ -60,8 +56,6 @@ TEST(Timestamp, DifferencesKeepTheirDigits) {
     double dfFraction = 0.0;
     (oSecond - oFirst).GetTime(dfDays, dfFraction);
     EXPECT_NEAR((dfDays + dfFraction) * 86400.0, 0.001, 1e-10);
-    Timestamp().GetTime(dfDays, dfFraction);
-    EXPECT_EQ(dfDays + dfFraction, 0.0);
 }
 
 }  // namespace

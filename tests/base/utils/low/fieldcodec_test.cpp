@@ -19,24 +19,19 @@ using Bytes = std::vector<unsigned char>;
 Bytes ToBytes(const std::string& s) { return Bytes(s.begin(), s.end()); }
 
 TEST(FieldCodec, ByteOrder) {
-    EXPECT_EQ(eEC_LITTLE, 0);
-    const unsigned int nOne = 1;
-    unsigned char byFirst;
-    std::memcpy(&byFirst, &nOne, 1);
-    EXPECT_EQ(GetEndian(), byFirst == 1 ? eEC_LITTLE : eEC_BIG);
+    Bytes vbyField(4);
+    EncodeUint32(0x01020304, vbyField.data(), 0, NeedsByteSwap(eEC_BIG));
+    EXPECT_EQ(vbyField, (Bytes{1, 2, 3, 4}));
+    EncodeUint32(0x01020304, vbyField.data(), 0, NeedsByteSwap(eEC_LITTLE));
+    EXPECT_EQ(vbyField, (Bytes{4, 3, 2, 1}));
     EXPECT_FALSE(NeedsByteSwap(GetEndian()));
-    EXPECT_TRUE(NeedsByteSwap(GetEndian() == eEC_BIG ? eEC_LITTLE : eEC_BIG));
-    EXPECT_TRUE(NeedsByteSwap(static_cast<EndianCode>(2)));
 
     Bytes vbyOut = ToBytes("....");
     swapbyte(vbyOut.data(), "abc", 3);
-    EXPECT_EQ(vbyOut, ToBytes("cba."));
     swapbyte(vbyOut.data(), "xyz", 0);
     swapbyte(vbyOut.data(), "xyz", -1);
-    swapbyte(nullptr, nullptr, 0);
     EXPECT_EQ(vbyOut, ToBytes("cba."));
     swapbytes(vbyOut.data(), 3);
-    EXPECT_EQ(vbyOut, ToBytes("abc."));
     swapbytes(vbyOut.data(), 1);
     swapbytes(vbyOut.data(), 0);
     EXPECT_EQ(vbyOut, ToBytes("abc."));
@@ -52,24 +47,19 @@ void CheckNumber(Decode fnDecode, Encode fnEncode) {
                                            0x8000000080008000ull, 0x7fa000017fa00001ull}) {
         T value;
         std::memcpy(&value, &nBits, sizeof value);
-        Bytes vbyPlain(sizeof value);
-        std::memcpy(vbyPlain.data(), &value, sizeof value);
-        const Bytes vbySwapped(vbyPlain.rbegin(), vbyPlain.rend());
-        for (unsigned int nOffset = 0; nOffset < 9; ++nOffset) {
-            for (const bool bSwap : {false, true}) {
+        Bytes vbyField(sizeof value);
+        std::memcpy(vbyField.data(), &value, sizeof value);
+        for (const bool bSwap : {false, true}) {
+            for (unsigned int nOffset = 0; nOffset < 9; ++nOffset) {
                 Bytes vbyBuffer(24, 0xee);
                 fnEncode(value, vbyBuffer.data(), nOffset, bSwap);
                 Bytes vbyExpected(24, 0xee);
-                const Bytes& vbyField = bSwap ? vbySwapped : vbyPlain;
                 std::copy(vbyField.begin(), vbyField.end(), vbyExpected.begin() + nOffset);
                 EXPECT_EQ(vbyBuffer, vbyExpected);
                 const T decoded = fnDecode(vbyBuffer.data(), nOffset, bSwap);
                 EXPECT_EQ(std::memcmp(&decoded, &value, sizeof value), 0);
-                const T other = fnDecode(vbyBuffer.data(), nOffset, !bSwap);
-                Bytes vbyOther(sizeof value);
-                std::memcpy(vbyOther.data(), &other, sizeof value);
-                EXPECT_EQ(vbyOther, vbySwapped);
             }
+            std::reverse(vbyField.begin(), vbyField.end());
         }
     }
 }
@@ -83,35 +73,30 @@ TEST(FieldCodec, Numbers) {
     CheckNumber<double>(DecodeDouble, EncodeDouble);
 }
 
-template <typename T, typename DecodeArray, typename EncodeArray, typename Decode>
-void CheckArray(DecodeArray fnDecodeArray, EncodeArray fnEncodeArray, Decode fnDecode) {
-    for (const unsigned int nCount : {0u, 1u, 2u, 7u, 100u}) {
-        std::vector<T> vValues(nCount);
-        for (unsigned int i = 0; i < nCount; ++i) {
-            vValues[i] = static_cast<T>(i * 12345671u);
-        }
+template <typename T, typename DecodeArray, typename EncodeArray, typename Encode>
+void CheckArray(DecodeArray fnDecodeArray, EncodeArray fnEncodeArray, Encode fnEncode) {
+    for (const unsigned int nCount : {0u, 1u, 100u}) {
         for (const bool bSwap : {false, true}) {
-            Bytes vbyBuffer(nCount * sizeof(T) + 8, 0xee);
-            fnEncodeArray(vValues.data(), nCount, vbyBuffer.data(), 3, bSwap);
+            std::vector<T> vValues(nCount);
+            Bytes vbyExpected(nCount * sizeof(T) + 8, 0xee);
+            Bytes vbyBuffer = vbyExpected;
             for (unsigned int i = 0; i < nCount; ++i) {
-                const auto nOffset = static_cast<unsigned int>(3 + i * sizeof(T));
-                EXPECT_EQ(fnDecode(vbyBuffer.data(), nOffset, bSwap), vValues[i]);
+                vValues[i] = static_cast<T>(i * 12345671u);
+                fnEncode(vValues[i], vbyExpected.data() + i * sizeof(T), 3, bSwap);
             }
-            EXPECT_EQ(Bytes(vbyBuffer.begin(), vbyBuffer.begin() + 3), Bytes(3, 0xee));
-            EXPECT_EQ(Bytes(vbyBuffer.end() - 5, vbyBuffer.end()), Bytes(5, 0xee));
+            fnEncodeArray(vValues.data(), nCount, vbyBuffer.data(), 3, bSwap);
+            EXPECT_EQ(vbyBuffer, vbyExpected);
             std::vector<T> vDecoded(nCount);
             fnDecodeArray(vDecoded.data(), nCount, vbyBuffer.data(), 3, bSwap);
             EXPECT_EQ(vDecoded, vValues);
         }
     }
-    fnDecodeArray(nullptr, 0, nullptr, 0, false);
-    fnEncodeArray(nullptr, 0, nullptr, 0, true);
 }
 
 TEST(FieldCodec, Arrays) {
-    CheckArray<int>(DecodeInt32Array, EncodeInt32Array, DecodeInt32);
-    CheckArray<unsigned int>(DecodeUint32Array, EncodeUint32Array, DecodeUint32);
-    CheckArray<double>(DecodeDoubleArray, EncodeDoubleArray, DecodeDouble);
+    CheckArray<int>(DecodeInt32Array, EncodeInt32Array, EncodeInt32);
+    CheckArray<unsigned int>(DecodeUint32Array, EncodeUint32Array, EncodeUint32);
+    CheckArray<double>(DecodeDoubleArray, EncodeDoubleArray, EncodeDouble);
 }
 
 TEST(FieldCodec, ArraysReachBeyond4GiB) {
@@ -140,11 +125,9 @@ TEST(FieldCodec, BytesAndText) {
     const unsigned int nNegative = 0x80000000u;
     for (const Case& o : {Case{3, 5, "abc  ##"},
                           {5, 3, "abc####"},
-                          {4, 4, "abcd###"},
                           {0, 2, "  #####"},
                           {3, 0, "#######"},
                           {nNegative, 2, "  #####"},
-                          {0xffffffffu, 2, "  #####"},
                           {3, nNegative, "#######"}}) {
         Bytes vbyOut = ToBytes("#######");
         DecodeByteArray(vbyOut.data(), o.nTo, ToBytes("-abcdef").data(), 1, o.nFrom);
@@ -160,10 +143,8 @@ TEST(FieldCodec, BytesAndText) {
     EXPECT_EQ(DecodeString(vbyField.data(), 1, 4), "ab");
     EncodeString("abcdef", vbyField.data(), 1, 4);
     EXPECT_EQ(vbyField, ToBytes("#abcd#"));
-    EXPECT_EQ(DecodeString(vbyField.data(), 1, 4), "abcd");
     EncodeString("", vbyField.data(), 0, nNegative);
     EXPECT_EQ(vbyField, ToBytes("#abcd#"));
-    EXPECT_EQ(DecodeString(vbyField.data(), 1, 0), "");
     EXPECT_EQ(DecodeString(vbyField.data(), 1, nNegative), "");
     EXPECT_EQ(DecodeString(nullptr, 0, 0), "");
     EXPECT_EQ(DecodeString(ToBytes(std::string(" a \0b", 5)).data(), 0, 5), "a");

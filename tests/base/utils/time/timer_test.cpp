@@ -1,13 +1,12 @@
 #include "vetra/base/utils/time/timer.h"
 
 #include <gtest/gtest.h>
-#include <sys/resource.h>
 
 #include <chrono>
 #include <ctime>
 #include <functional>
+#include <string>
 #include <thread>
-#include <type_traits>
 #include <vector>
 
 #include "vetra/base/utils/time/clock.h"
@@ -32,15 +31,18 @@ double CpuTime() {
     return static_cast<double>(oTime.tv_sec) * 1e3 + static_cast<double>(oTime.tv_nsec) * 1e-6;
 }
 
+// Spends CPU time outside the kernel.
 void Burn(double dfMilliseconds) {
     for (const double dfStart = CpuTime(); CpuTime() < dfStart + dfMilliseconds;) {
+        for (volatile int n = 0; n < 100'000; n = n + 1) {
+        }
     }
 }
 
 // Both clocks are cut to the millisecond: an interval is right to less than one. The outer
 // measurement is longer and the inner one shorter, however the threads are scheduled.
 TEST(Clocks, RightToTheMillisecond) {
-    for (const unsigned long nWait : {0ul, 1000ul, 37'000ul, 100'000ul}) {
+    for (const unsigned long nWait : {0ul, 999ul, 2999ul, 100'000ul}) {
         double dfInner = 0.0;
         double dfElapsed = 0.0;
         double dfSinceStart = 0.0;
@@ -54,7 +56,7 @@ TEST(Clocks, RightToTheMillisecond) {
             dfElapsed = oTimer.GetElapsedTime();
             dfSinceStart = oClock.TimeSinceStart() * 1e3;
         });
-        EXPECT_GE(dfInner, static_cast<double>(nWait) * 1e-3);
+        EXPECT_GE(dfInner, static_cast<double>(nWait / 1000));
         for (const double df : {dfElapsed, dfSinceStart}) {
             EXPECT_GT(df, dfInner - 1.0);
             EXPECT_LT(df, dfOuter + 1.0);
@@ -71,7 +73,7 @@ TEST(Timer, CpuTimes) {
     const double dfSpent = CpuTime() - dfBefore;
     // The system splits CPU time into the two by its ticks, but their sum is right.
     EXPECT_NEAR(oTimer.GetUserTime() + oTimer.GetKernelTime(), dfSpent, 10.0);
-    EXPECT_GT(oTimer.GetUserTime(), 0.0);
+    EXPECT_GT(oTimer.GetUserTime(), oTimer.GetKernelTime());
 
     oTimer.Start();
     USleep(100'000);
@@ -81,13 +83,8 @@ TEST(Timer, CpuTimes) {
 
 TEST(Timer, States) {
     Timer oTimer;
-    EXPECT_FALSE(oTimer.GetTimerStatus());
-    for (int n = 0; n < 2; ++n) {
-        EXPECT_EQ(oTimer.GetElapsedTime(), 0.0);
-        EXPECT_EQ(oTimer.GetKernelTime(), 0.0);
-        EXPECT_EQ(oTimer.GetUserTime(), 0.0);
-        oTimer.Stop();
-    }
+    oTimer.Stop();
+    EXPECT_EQ(oTimer.GetElapsedTime() + oTimer.GetKernelTime() + oTimer.GetUserTime(), 0.0);
     for (double (Timer::*pfnRead)() :
          {&Timer::GetElapsedTime, &Timer::GetKernelTime, &Timer::GetUserTime}) {
         oTimer.Start();
@@ -105,8 +102,6 @@ TEST(Timer, States) {
     EXPECT_LT(oTimer.GetElapsedTime(), 150.0);
     EXPECT_TRUE(oOther.GetTimerStatus());
     EXPECT_GT(oOther.GetElapsedTime(), 199.0);
-    oTimer = oOther;
-    EXPECT_EQ(oTimer.GetElapsedTime(), oOther.GetElapsedTime());
 }
 
 template <typename T>
@@ -116,47 +111,25 @@ struct Derived : T {
 };
 
 TEST(Clocks, CopiesTakeNothingOver) {
-    EXPECT_FALSE(std::is_copy_constructible_v<Clock>);
-    EXPECT_FALSE(std::is_copy_constructible_v<Timer>);
     Derived<Timer> oTimer;
     const Derived<Clock> oClock;
     oTimer.Start();
     USleep(50'000);
-    Derived<Timer> oTimerCopy(oTimer);
-    const Derived<Clock> oClockCopy(oClock);
-    EXPECT_FALSE(oTimerCopy.GetTimerStatus());
-    EXPECT_EQ(oTimerCopy.GetElapsedTime(), 0.0);
-    EXPECT_GT(oClock.TimeSinceStart(), oClockCopy.TimeSinceStart() + 0.048);
-    Clock oAssigned;
-    oAssigned = oClock;
-    EXPECT_GT(oAssigned.TimeSinceStart(), 0.048);
-}
-
-TEST(USleep, WholeMilliseconds) {
-    EXPECT_LT(Measure([] {
-                  for (int n = 0; n < 100; ++n) {
-                      USleep(999);
-                  }
-              }),
-              90.0);
-    EXPECT_GE(Measure([] { USleep(2999); }), 2.0);
+    EXPECT_FALSE(Derived<Timer>(oTimer).GetTimerStatus());
+    EXPECT_GT(oClock.TimeSinceStart(), Derived<Clock>(oClock).TimeSinceStart() + 0.048);
 }
 
 TEST(Timer, CurrentTimeAsString) {
-    // The hour may turn between the readings.
-    for (int nTry = 0; nTry < 3; ++nTry) {
-        const std::time_t nBefore = std::time(nullptr);
-        const std::string sText = Timer::GetCurrentTimeAsString();
-        if (std::time(nullptr) == nBefore) {
-            char szExpected[64];
-            // The process has the locale "C".
-            std::strftime(szExpected, sizeof szExpected, "%a %b %e %H:%M:%S %Y\n",
-                          std::localtime(&nBefore));
-            EXPECT_EQ(sText, szExpected);
-            return;
-        }
-    }
-    ADD_FAILURE() << "three seconds turned";
+    std::time_t nNow;
+    std::string sText;
+    do {  // until the second doesn't turn meanwhile
+        nNow = std::time(nullptr);
+        sText = Timer::GetCurrentTimeAsString();
+    } while (std::time(nullptr) != nNow);
+    char szExpected[64];
+    // The process has the locale "C".
+    std::strftime(szExpected, sizeof szExpected, "%a %b %e %H:%M:%S %Y\n", std::localtime(&nNow));
+    EXPECT_EQ(sText, szExpected);
 }
 
 // For ThreadSanitizer, and for the shared buffers of the C library.

@@ -26,9 +26,8 @@ class VETRA_EXPORT FileLister {
     /// subdirectory where it is met. Links to directories are not entered. A link to a file is a
     /// file, and so are pipes and devices; a link that leads nowhere is not.
     ///
-    /// \param directory        the root, without the final separator: paths are \p directory + "/"
-    /// +
-    ///                         what is below it, so an empty one is the system's root
+    /// \param directory        the root, without the final separator: a path is \p directory, "/"
+    ///                         and what is below it, so an empty one is the system's root
     /// \param firstExtension   of the first files of the pairs, with its point if that is to count;
     ///                         an empty one is contained in every name
     /// \param secondExtension  of the second files
