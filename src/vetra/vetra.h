@@ -2,10 +2,14 @@
 #define VETRA_VETRA_H
 
 /// Every public header.
+#include "vetra/base/utils/fs/filelister.h"
 #include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/geo/ellipcalc.h"
 #include "vetra/base/utils/geo/geodesy.h"
 #include "vetra/base/utils/geo/solarposition.h"
+#include "vetra/base/utils/low/copypixel.h"
+#include "vetra/base/utils/low/fieldcodec.h"
+#include "vetra/base/utils/low/fileposition.h"
 #include "vetra/base/utils/math/convexhull.h"
 #include "vetra/base/utils/math/fourier/cdft.h"
 #include "vetra/base/utils/math/fourier/complexdft.h"
@@ -54,7 +58,12 @@
 #include "vetra/base/utils/string/itokenizer.h"
 #include "vetra/base/utils/string/stringtokenizer.h"
 #include "vetra/base/utils/string/stringutils.h"
+#include "vetra/base/utils/time/clock.h"
+#include "vetra/base/utils/time/timer.h"
+#include "vetra/base/utils/time/usleep.h"
 #include "vetra/basic/gobs/raster/datatypeadapter.h"
+#include "vetra/chronocore/timestamp.h"
+#include "vetra/chronocore/timesystemconverter.h"
 #include "vetra/export.h"
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"

@@ -14,8 +14,9 @@ namespace vetra::tests {
 /// A new folder for temporary files, deleted with the object.
 class ScratchFolder {
  public:
-    ScratchFolder() {
-        std::string sFolder = std::filesystem::temp_directory_path() / "vetra-test-XXXXXX";
+    explicit ScratchFolder(
+        const std::filesystem::path& oParent = std::filesystem::temp_directory_path()) {
+        std::string sFolder = oParent / "vetra-test-XXXXXX";
         if (mkdtemp(sFolder.data()) == nullptr) {
             throw std::runtime_error("no folder for temporary files");
         }

@@ -1,34 +1,24 @@
 #include "vetra/base/utils/fs/fileutils.h"
 
-#include <dirent.h>
-#include <fcntl.h>
-#include <sys/stat.h>
 #include <unistd.h>
 
 #include <algorithm>
-#include <memory>
 #include <string_view>
 #include <utility>
 
+#include "vetra/base/utils/fs/filekind.h"
+#include "vetra/base/utils/fs/folderlisting.h"
 #include "vetra/faultcore/exceptions.h"
 
 namespace {
 
-enum class Kind { eNothing, eFile, eDirectory };
+using vetra::utils::FileKind;
+using vetra::utils::FolderEntry;
+using vetra::utils::HasZero;
+using vetra::utils::KindOf;
 
-// The C library would take the path up to a zero byte, and find or delete another file.
-bool HasZero(const std::string& sPath) { return sPath.find('\0') != std::string::npos; }
-
-Kind KindOf(int nFolder, const char* pszPath, int nFlags) {
-    struct stat oStatus;
-    if (fstatat(nFolder, pszPath, &oStatus, nFlags) != 0) {
-        return Kind::eNothing;
-    }
-    return S_ISDIR(oStatus.st_mode) ? Kind::eDirectory : Kind::eFile;
-}
-
-Kind KindOf(const std::string& sPath) {
-    return HasZero(sPath) ? Kind::eNothing : KindOf(AT_FDCWD, sPath.c_str(), 0);
+FileKind KindOf(const std::string& sPath) {
+    return HasZero(sPath) ? FileKind::eNothing : KindOf(AT_FDCWD, sPath.c_str(), 0);
 }
 
 bool Permits(const std::string& sPath, int nMode) {
@@ -38,48 +28,7 @@ bool Permits(const std::string& sPath, int nMode) {
     return access(sPath.c_str(), nMode) == 0;
 }
 
-struct Listing {
-    std::vector<std::string> vsFiles;
-    std::vector<std::string> vsFolders;
-};
-
-struct CloseFolder {
-    void operator()(DIR* poFolder) const { closedir(poFolder); }
-};
-
-// The names in a folder, in the order in which the system gives them; of the folders only those
-// that may be entered.
-Listing List(const std::string& sFolder) {
-    Listing oListing;
-    if (HasZero(sFolder)) {
-        return oListing;
-    }
-    const std::unique_ptr<DIR, CloseFolder> poFolder(
-        opendir(sFolder.empty() ? "." : sFolder.c_str()));
-    if (poFolder == nullptr) {
-        return oListing;
-    }
-    while (const dirent* poEntry = readdir(poFolder.get())) {
-        const std::string sName = poEntry->d_name;
-        if (sName == "." || sName == "..") {
-            continue;
-        }
-        const int nFolder = dirfd(poFolder.get());
-        const bool bKnown = poEntry->d_type != DT_UNKNOWN;
-        const bool bFolder =
-            bKnown ? poEntry->d_type == DT_DIR
-                   : KindOf(nFolder, poEntry->d_name, AT_SYMLINK_NOFOLLOW) == Kind::eDirectory;
-        if (bFolder) {
-            oListing.vsFolders.push_back(sName);
-        } else if ((bKnown && poEntry->d_type != DT_LNK) ||
-                   KindOf(nFolder, poEntry->d_name, 0) == Kind::eFile) {
-            oListing.vsFiles.push_back(sName);
-        }
-    }
-    return oListing;
-}
-
-// Calls fnVisit(prefix, file names) for a folder, then for each of its subfolders and all below it.
+// Calls fnVisit(prefix, entries) for a folder, then for each of its subfolders and all below it.
 // A prefix is what stands ahead of the names in a folder's paths.
 //
 // The folders still to visit are a list and not calls within calls, and one folder is open at a
@@ -91,11 +40,12 @@ void Walk(const std::string& sRoot, bool bRecurse, Visit fnVisit) {
     while (!vsPrefixes.empty()) {
         const std::string sPrefix = std::move(vsPrefixes.back());
         vsPrefixes.pop_back();
-        const Listing oListing = List(sPrefix);
-        fnVisit(sPrefix, oListing.vsFiles);
-        if (bRecurse) {
-            for (auto it = oListing.vsFolders.rbegin(); it != oListing.vsFolders.rend(); ++it) {
-                vsPrefixes.push_back(sPrefix + *it + '/');
+        std::vector<FolderEntry> voEntries;
+        vetra::utils::ListFolder(sPrefix, voEntries);
+        fnVisit(sPrefix, voEntries);
+        for (auto it = voEntries.rbegin(); bRecurse && it != voEntries.rend(); ++it) {
+            if (it->bFolder) {
+                vsPrefixes.push_back(sPrefix + it->sName + '/');
             }
         }
     }
@@ -135,8 +85,8 @@ bool EndsWith(std::string_view sName, std::string_view sSuffix) {
 
 }  // namespace
 
-bool IsFile(const std::string& path) { return KindOf(path) == Kind::eFile; }
-bool IsDirectory(const std::string& path) { return KindOf(path) == Kind::eDirectory; }
+bool IsFile(const std::string& path) { return KindOf(path) == FileKind::eFile; }
+bool IsDirectory(const std::string& path) { return KindOf(path) == FileKind::eDirectory; }
 
 bool CanRead(const std::string& path) { return Permits(path, R_OK); }
 bool CanWrite(const std::string& path) { return Permits(path, W_OK); }
@@ -153,7 +103,7 @@ void RemoveFile(const std::string& path) {
         return;
     }
     // Not followed: a link that leads nowhere can be in the way too.
-    if (KindOf(AT_FDCWD, path.c_str(), AT_SYMLINK_NOFOLLOW) != Kind::eNothing) {
+    if (KindOf(AT_FDCWD, path.c_str(), AT_SYMLINK_NOFOLLOW) != FileKind::eNothing) {
         throw vetra::FileAccessException(path, vetra::FileAccessException::eCannotDelete,
                                          "File cannot be deleted", VETRA_HERE);
     }
@@ -167,10 +117,10 @@ std::vector<std::string> FindFiles(const std::string& directory, const std::stri
     }
     // The order is that of the walk backwards, each directory's own files forwards.
     Walk(directory + '/', recurse,
-         [&](const std::string& sPrefix, const std::vector<std::string>& vsFiles) {
-             for (auto it = vsFiles.rbegin(); it != vsFiles.rend(); ++it) {
-                 if (EndsWith(*it, suffix)) {
-                     vsFound.push_back(sPrefix + *it);
+         [&](const std::string& sPrefix, const std::vector<FolderEntry>& voEntries) {
+             for (auto it = voEntries.rbegin(); it != voEntries.rend(); ++it) {
+                 if (!it->bFolder && EndsWith(it->sName, suffix)) {
+                     vsFound.push_back(sPrefix + it->sName);
                  }
              }
          });
@@ -183,10 +133,10 @@ std::vector<std::string> FindFilesByWildcard(const std::string& directory,
     std::vector<std::string> vsFound;
     const bool bClosed = directory.empty() || directory.back() == '/';
     Walk(bClosed ? directory : directory + '/', recurse,
-         [&](const std::string& sPrefix, const std::vector<std::string>& vsFiles) {
-             for (const std::string& sName : vsFiles) {
-                 if (Matches(sName, pattern)) {
-                     vsFound.push_back(sPrefix + sName);
+         [&](const std::string& sPrefix, const std::vector<FolderEntry>& voEntries) {
+             for (const FolderEntry& oEntry : voEntries) {
+                 if (!oEntry.bFolder && Matches(oEntry.sName, pattern)) {
+                     vsFound.push_back(sPrefix + oEntry.sName);
                  }
              }
          });

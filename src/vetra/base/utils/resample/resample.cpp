@@ -20,6 +20,7 @@
 #include "vetra/base/utils/resample/algorithm/resamplesinc16.h"
 #include "vetra/base/utils/resample/algorithm/resamplesinc8.h"
 #include "vetra/base/utils/resample/engine/dispatch.h"
+#include "vetra/basic/gobs/raster/sampletype.h"
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"
 
@@ -202,58 +203,33 @@ ResampleBuffer MakeRealView(const ResampleBuffer& oBuffer) {
                           const_cast<unsigned char*>(oBuffer.GetMask()), false);
 }
 
-[[noreturn]] void RefuseDatatype() {
-    throw ParameterException("oSrc", ParameterException::eInvalid, "", "",
-                             "Datatype of the provided raster is not supported for resampling",
-                             VETRA_HERE);
-}
-
 // Calls fnRun with a value of the sample type that a real code stands for.
 template <typename Function>
-void WithSampleType(NativeDataTypeCode eType, const Function& fnRun) {
-    switch (eType) {
-        case vetra::gobs::eDT_8U:
-            return fnRun(static_cast<unsigned char>(0));
-        case vetra::gobs::eDT_8S:
-            return fnRun(static_cast<signed char>(0));
-        case vetra::gobs::eDT_16U:
-            return fnRun(static_cast<unsigned short>(0));
-        case vetra::gobs::eDT_16S:
-            return fnRun(static_cast<short>(0));
-        case vetra::gobs::eDT_32U:
-            return fnRun(0u);
-        case vetra::gobs::eDT_32S:
-            return fnRun(0);
-        case vetra::gobs::eDT_32R:
-            return fnRun(0.0f);
-        case vetra::gobs::eDT_64U:
-            return fnRun(std::uint64_t{0});
-        case vetra::gobs::eDT_64S:
-            return fnRun(std::int64_t{0});
-        case vetra::gobs::eDT_64R:
-            return fnRun(0.0);
-        default:
-            RefuseDatatype();
+void RunWithSampleType(NativeDataTypeCode eType, const Function& fnRun) {
+    if (!vetra::gobs::WithSampleType(eType, fnRun)) {
+        throw ParameterException("oSrc", ParameterException::eInvalid, "", "",
+                                 "Datatype of the provided raster is not supported for resampling",
+                                 VETRA_HERE);
     }
 }
 
 void ResampleNoConv(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPosTfm& oTfm,
                     const ResampleInfo& oResParms, const RunOptions& oOptions) {
-    WithSampleType(oSrc.GetDatatype(), [&]<typename T>(T) {
+    RunWithSampleType(oSrc.GetDatatype(), [&]<typename T>(T) {
         ResampleFunc<T, T>(oSrc, oTgt, oTfm, oResParms, oOptions);
     });
 }
 
 void ResampleFloatToDT(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPosTfm& oTfm,
                        const ResampleInfo& oResParms, const RunOptions& oOptions) {
-    WithSampleType(oTgt.GetDatatype(), [&]<typename T>(T) {
+    RunWithSampleType(oTgt.GetDatatype(), [&]<typename T>(T) {
         ResampleFunc<float, T>(oSrc, oTgt, oTfm, oResParms, oOptions);
     });
 }
 
 void ResampleDTToFloat(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, const IBufPosTfm& oTfm,
                        const ResampleInfo& oResParms, const RunOptions& oOptions) {
-    WithSampleType(oSrc.GetDatatype(), [&]<typename T>(T) {
+    RunWithSampleType(oSrc.GetDatatype(), [&]<typename T>(T) {
         ResampleFunc<T, float>(oSrc, oTgt, oTfm, oResParms, oOptions);
     });
 }
