@@ -67,7 +67,7 @@ Case GdalCase(const Work& oWork) {
                                                              {"CUBIC", GRA_Cubic},
                                                              {"SINC8", GRA_Lanczos}};
     const auto itMethod = oMethods.find(oWork.MethodName());
-    if (oWork.bMask || oWork.nThreads != 1 || itMethod == oMethods.end()) {
+    if (!oWork.IsCommon() || oWork.nThreads != 1 || itMethod == oMethods.end()) {
         return {};
     }
     GDALAllRegister();

@@ -14,6 +14,7 @@ int main(int argc, char** argv) {
     for (const Work& oWork : AllWorks()) {
         for (const auto fnMake : {
                  &VetraCase,
+                 &PlainCase,
 #ifdef VETRA_BENCH_OPENCV
                  &OpenCvCase,
 #endif

@@ -25,7 +25,7 @@ int InterpolationOf(const std::string& sMethod) {
 
 Case OpenCvCase(const Work& oWork) {
     const int nMethod = InterpolationOf(oWork.MethodName());
-    if (oWork.bMask || DataTypeAdapter::IsComplex(oWork.eType) ||
+    if (!oWork.IsCommon() || DataTypeAdapter::IsComplex(oWork.eType) ||
         (nMethod < 0 && oWork.eGeometry != Work::Geometry::eUnit)) {
         return {};
     }

@@ -7,9 +7,12 @@
 #include <string>
 #include <vector>
 
-/// Collects the medians of benchmarks named "work/library" and prints them as a Markdown table:
-/// nanoseconds per target pixel, and the ratio of our time to each peer's. OpenCV's are remap and
-/// resize, GDAL's the warper and RasterIO.
+#include "workload.h"
+
+/// Collects the medians of benchmarks named "work/library" and prints them as two Markdown tables.
+/// One has nanoseconds per target pixel, the ratio of our time to each peer's, and the floor.
+/// OpenCV's are remap, resize, blur and medianBlur, GDAL's the warper and RasterIO. The other
+/// compares works of ours with each other.
 class TableReporter : public benchmark::BenchmarkReporter {
  public:
     bool ReportContext(const Context& oContext) override;
@@ -17,6 +20,10 @@ class TableReporter : public benchmark::BenchmarkReporter {
     void Finalize() override;
 
  private:
+    void PrintPeers();
+    void PrintBaselines();
+    double TimeOf(const Work& oWork, const std::string& sLibrary) const;
+
     /// By work, then by library.
     std::map<std::string, std::map<std::string, double>> moTimes;
 };

@@ -14,8 +14,24 @@ std::string Work::Name() const {
     const std::string sType = DataTypeAdapter::TypeToString(eType);
     return std::string(apszGeometry[static_cast<int>(eGeometry)]) + " " + pszMethod + ", " + sType +
            " x " + std::to_string(nChan) + (bMask ? ", mask" : "") +
-           (nThreads == 0 ? std::string(", all threads") : std::string(", 1 thread"));
+           (nThreads == 0 ? ", all threads" : "") +
+           (nTargetSize != kTargetSize ? ", target of " + std::to_string(nTargetSize) : "") +
+           (bAvx2 ? ", AVX2" : "");
 }
+
+Work Work::Baseline() const {
+    Work oBase = *this;
+    oBase.bMask = false;
+    oBase.nThreads = 1;
+    oBase.nTargetSize = kTargetSize;
+    oBase.bAvx2 = false;
+    if (oBase.Name() == Name() && MethodName().rfind("SQ", 0) == 0) {
+        oBase.pszMethod += 2;
+    }
+    return oBase;
+}
+
+bool Work::IsCommon() const { return !bMask && nTargetSize == kTargetSize && !bAvx2; }
 
 std::string Work::MethodName() const {
     return std::string(pszMethod, std::strcspn(pszMethod, ","));
@@ -71,14 +87,14 @@ std::vector<unsigned char>& SourceMask() {
 }
 
 std::vector<unsigned char>& TargetSamples() {
-    static std::vector<unsigned char> vbySamples(static_cast<std::size_t>(kTargetPixels) * 16);
+    static std::vector<unsigned char> vbySamples(std::size_t{kTargetSize} * kTargetSize * 16);
     return vbySamples;
 }
 
 namespace {
 
 std::vector<float> MakeRotated(double dfFirst, double dfPerCol, double dfPerRow) {
-    std::vector<float> vfPositions(static_cast<std::size_t>(kTargetPixels));
+    std::vector<float> vfPositions(std::size_t{kTargetSize} * kTargetSize);
     for (std::size_t i = 0; i < vfPositions.size(); ++i) {
         const double x = static_cast<double>(i % kTargetSize);
         const double y = static_cast<double>(i / kTargetSize);
@@ -103,31 +119,43 @@ std::vector<float>& RotatedRows() {
 
 std::vector<Work> AllWorks() {
     using Geometry = Work::Geometry;
+    const char* const apszWindows[] = {"NEAR",    "BILIN",     "CUBIC",
+                                       "CUBICPS", "LAGRANGE4", "LAGRANGE8",
+                                       "SINC8",   "SINC16",    "GAUSSIAN,DSFACTORCOL=2"};
     std::vector<Work> voWorks;
     for (const Geometry eGeometry : {Geometry::eRotated, Geometry::eDown, Geometry::eUp}) {
-        for (const char* pszMethod : {"NEAR", "BILIN"}) {
-            for (const int nChan : {1, 3, 4}) {
+        for (const char* pszMethod : apszWindows) {
+            const Work oWork{eGeometry, pszMethod};
+            voWorks.push_back(oWork);
+            if (eGeometry != Geometry::eUp) {
+                voWorks.push_back(oWork);
+                voWorks.back().bMask = true;
+                voWorks.push_back(oWork);
+                voWorks.back().bAvx2 = true;
+            }
+        }
+        for (const char* pszMethod : {"NEAR", "BILIN", "CUBIC"}) {
+            for (const int nChan : {3, 4}) {
                 voWorks.push_back({eGeometry, pszMethod, eDT_8U, nChan});
             }
             for (const NativeDataTypeCode eType : {eDT_16U, eDT_32R}) {
                 voWorks.push_back({eGeometry, pszMethod, eType});
             }
-            voWorks.push_back({eGeometry, pszMethod, eDT_8U, 1, true});
-            voWorks.push_back({eGeometry, pszMethod, eDT_8U, 1, false, 0});
+            voWorks.push_back({eGeometry, pszMethod});
+            voWorks.back().nThreads = 0;
+            voWorks.push_back({eGeometry, pszMethod});
+            voWorks.back().nTargetSize = 64;
         }
-        for (const char* pszMethod : {"CUBIC", "LAGRANGE4", "LAGRANGE8", "SINC8", "SINC16",
-                                      "GAUSSIAN,DSFACTORCOL=2", "SQBILIN", "SQCUBIC", "SQSINC8"}) {
+        for (const char* pszMethod : {"SQBILIN", "SQCUBIC", "SQSINC8"}) {
             voWorks.push_back({eGeometry, pszMethod});
         }
-        voWorks.push_back({eGeometry, "CUBIC", eDT_8U, 3});
-        voWorks.push_back({eGeometry, "CUBIC", eDT_8U, 1, true});
-        voWorks.push_back({eGeometry, "SINC8", eDT_8U, 1, true});
-        voWorks.push_back({eGeometry, "SINC8", eDT_8U, 1, false, 0});
     }
     for (const char* pszMethod : {"AVERAGE,NUMCOLS=3,NUMROWS=3", "AVERAGE,NUMCOLS=31,NUMROWS=31",
                                   "MEDIAN,NUMCOLS=3,NUMROWS=3", "MEDIAN,NUMCOLS=5,NUMROWS=5",
                                   "MEDIAN,NUMCOLS=9,NUMROWS=9"}) {
         voWorks.push_back({Geometry::eUnit, pszMethod});
+        voWorks.push_back({Geometry::eUnit, pszMethod});
+        voWorks.back().bAvx2 = true;
     }
     voWorks.push_back({Geometry::eRotated, "CPLXSAR,NUMCOLS=7,NUMROWS=7", eDT_C32R});
     return voWorks;

@@ -7,6 +7,9 @@
 
 #include "vetra/basic/gobs/raster/datatypeadapter.h"
 
+constexpr int kSourceSize = 4096;
+constexpr int kTargetSize = 3000;
+
 /// What is measured: a source of 4096 x 4096 pixels sampled at the pixels of a target.
 struct Work {
     enum class Geometry {
@@ -22,17 +25,21 @@ struct Work {
     int nChan = 1;
     bool bMask = false;  ///< one source pixel in a hundred is invalid
     int nThreads = 1;    ///< 0: all
+    int nTargetSize = kTargetSize;
+    bool bAvx2 = false;  ///< on the processor level x86-64-v3, if the machine has a higher one
 
     std::string Name() const;
     /// The method's name, without what follows a comma.
     std::string MethodName() const;
     /// Columns, and rows, of a mean's or median's window.
     int WindowSize() const;
+    /// What it is compared with: the same without a mask, with one thread, a large target, the
+    /// machine's own level, or by the plain twin of a squared method. Itself if there is no such.
+    Work Baseline() const;
+    double TargetPixels() const { return double(nTargetSize) * nTargetSize; }
+    /// A work that peers are asked for, too.
+    bool IsCommon() const;
 };
-
-constexpr int kSourceSize = 4096;
-constexpr int kTargetSize = 3000;
-constexpr double kTargetPixels = double{kTargetSize} * kTargetSize;
 
 /// First source column and row, and source pixels per target pixel, of an axis-aligned work.
 double FirstSource(Work::Geometry eGeometry);
@@ -57,5 +64,7 @@ struct Case {
 Case VetraCase(const Work& oWork);
 Case OpenCvCase(const Work& oWork);
 Case GdalCase(const Work& oWork);
+/// The tests' plain evaluation, one pixel after the other.
+Case PlainCase(const Work& oWork);
 
 #endif  // VETRA_BENCH_WORKLOAD_H

@@ -6,10 +6,10 @@ set -euo pipefail
 declare -A groups=(
     [build]="g++ cmake ninja-build"
     [tool]="libgdal-dev libcli11-dev"
-    [tests]="clang libclang-rt-dev libomp-dev libgtest-dev pkg-config"
+    [tests]="clang libclang-rt-dev libomp-dev libgtest-dev libeigen3-dev pkg-config"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
-    [bench]="libbenchmark-dev libopencv-dev"
+    [bench]="libbenchmark-dev libopencv-dev libeigen3-dev libfftw3-dev libgeographiclib-dev"
 )
 
 missing=()

@@ -108,6 +108,26 @@ int main() {
     Check(FindFilesByWildcard("", "kernel.tx?", false).size() == 1, "found files");
     RemoveFile("kernel.txt");
     Check(!IsFile("kernel.txt"), "removed file");
+    const double adfRamp[] = {0.0, 1.0, 2.0};
+    Check(Poly1D(1, adfRamp).GetValue(3.0) == 3.0 &&
+              Poly2D(1, adfRamp).GetValue(2.0, poweri(2.0, 2)) == 10.0,
+          "polynomials");
+    InterpGrid1D oGrid1;
+    InterpGrid2D oGrid2;
+    InterpGrid3D oGrid3;
+    oGrid1.LayoutGrid(0.0, 1.0, 1.0);
+    oGrid2.LayoutGrid(0.0, 0.0, 1.0, 1.0, 1.0, 1.0);
+    oGrid3.LayoutGrid(0.0, 0.0, 0.0, 1.0, 1.0, 1.0, 1.0, 1.0, 1.0);
+    Check(oGrid1.GetNumGridPoints() * oGrid2.GetNumGridPoints() * oGrid3.GetNumGridPoints() == 64,
+          "grids");
+    double adfInterpolated[4];
+    interpolate_linear(1.0, 3.0, 0.5, adfInterpolated[0]);
+    interpolate_Lagrange(3, adfRamp, 1, 1.5, &adfInterpolated[1]);
+    interpolate_Lagrange({0.0, 1.0}, {0.0, 1.0}, 1.5, adfInterpolated[2]);
+    interpolate_Lagrange_rate(0.0, 1.0, 2.0, 3.0, 0.5, 1.0, adfInterpolated[3]);
+    Check(adfInterpolated[0] == 2.0 && adfInterpolated[1] == 1.5 && adfInterpolated[2] == 1.5,
+          "interpolation");
+    Check(ConvexHull({{0.0, 0.0}, {1.0, 0.0}, {0.0, 1.0}}).IsInside({0.25, 0.25}), "convex hull");
     Check(FormatString("%d.%d.%d", VETRA_VERSION_MAJOR, VETRA_VERSION_MINOR, VETRA_VERSION_PATCH) ==
               VETRA_VERSION,
           "version");

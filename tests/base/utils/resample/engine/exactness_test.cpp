@@ -205,19 +205,19 @@ void CompareRandomRun(Random& oRandom, const TypePair& oPair, ResampleMethod eMe
                                                 oTgt.oMask.Get() + oTgt.oMask.Size());
 
     for (const engine::Level eLevel : engine::GetSupportedLevels()) {
-        for (const bool bShortcuts : {true, false}) {
+        for (const engine::Path ePath : {engine::Path::eBest, engine::Path::ePlain}) {
             const int nThreads = oRandom.Pick({1, 2, 3, 7});
             SCOPED_TRACE(testing::Message()
-                         << engine::GetStages(eLevel).pszName << " shortcuts " << bShortcuts
-                         << " threads " << nThreads << " transform " << TransformName(*poTfm)
-                         << " source " << nSrcCols << "x" << nSrcRows << " target " << nTgtCols
-                         << "x" << nTgtRows << " channels " << nChan);
+                         << engine::GetStages(eLevel).pszName << " path "
+                         << engine::GetPathName(ePath) << " threads " << nThreads << " transform "
+                         << TransformName(*poTfm) << " source " << nSrcCols << "x" << nSrcRows
+                         << " target " << nTgtCols << "x" << nTgtRows << " channels " << nChan);
             omp_set_num_threads(nThreads);
             std::copy(vbyStart.begin(), vbyStart.end(), oTgt.oSamples.Get());
             GuardedBytes oOutcome(vbyWantOutcome.size());
             engine::RunOptions oOptions;
             oOptions.eLevel = eLevel;
-            oOptions.bShortcuts = bShortcuts;
+            oOptions.ePath = ePath;
             oOptions.pabyOutcome = oOutcome.Get();
             engine::Resample(oSrc.oBuffer, oTgt.oBuffer, *poTfm, oInfo, oOptions);
             ASSERT_EQ(0, std::memcmp(oTgt.oSamples.Get(), oWant.oSamples.Get(), vbyStart.size()));

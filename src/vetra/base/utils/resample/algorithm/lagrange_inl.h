@@ -3,6 +3,20 @@
 //
 // At a fraction of exactly 0 the value is the sample there, without arithmetic.
 
+// The quotients of some numbers by integers.
+template <int N>
+inline void DivideAll(F64 (&x)[N], const Divisor (&aoDivisor)[N]) {
+    if (!AnyTiny(x)) {
+        for (int k = 0; k < N; ++k) {
+            x[k] = DivideBy(x[k], aoDivisor[k]);
+        }
+    } else {
+        for (int k = 0; k < N; ++k) {
+            x[k] = x[k] / Set1(aoDivisor[k].dfValue);
+        }
+    }
+}
+
 // Degree 3, through nodes 0 to 3; t is measured from node 1.
 struct Lagrange4Filter {
     static constexpr int kTaps = 4;
@@ -19,9 +33,12 @@ struct Lagrange4Filter {
     F64 Value(const Samples& fnSample) const {
         const F64 p[kTaps] = {fnSample(0), fnSample(1), fnSample(2), fnSample(3)};
         const F64 half = Set1(0.5);
-        const F64 six = Set1(6.0);
-        const F64 value = p[1] * d0 * d2 * d3 * half - d1 * p[0] * d2 * d3 / six -
-                          p[2] * d0 * d1 * d3 * half + p[3] * d0 * d1 * d2 / six;
+        constexpr Divisor kSix = MakeDivisor(6);
+        constexpr Divisor kaoDivisor[2] = {kSix, kSix};
+        F64 outer[2] = {d1 * p[0] * d2 * d3, p[3] * d0 * d1 * d2};
+        DivideAll(outer, kaoDivisor);
+        const F64 value =
+            p[1] * d0 * d2 * d3 * half - outer[0] - p[2] * d0 * d1 * d3 * half + outer[1];
         return Select(onNode, p[1], value);
     }
 
@@ -36,28 +53,34 @@ struct Lagrange8Filter {
 
     explicit Lagrange8Filter(const FilterInput& oInput) : onNode(oInput.frac == Set1(0.0)) {
         const F64 u = oInput.frac + Set1(3.0);
+        F64 distance[kTaps];
         for (int k = 0; k < kTaps; ++k) {
-            // The product of the distances to the other nodes, in ascending order.
-            const int nFirst = k == 0 ? 1 : 0;
-            product[k] = u - Set1(nFirst);
-            for (int j = nFirst + 1; j < kTaps; ++j) {
-                if (j != k) {
-                    product[k] = product[k] * (u - Set1(j));
-                }
+            distance[k] = u - Set1(k);
+        }
+        // Each is the product of the distances to the other nodes, in ascending order.
+        F64 below = distance[0];
+        for (int k = 0; k < kTaps; ++k) {
+            product[k] = k == 0 ? distance[1] : below;
+            for (int j = k == 0 ? 2 : k + 1; j < kTaps; ++j) {
+                product[k] = product[k] * distance[j];
             }
+            below = k == 0 ? below : below * distance[k];
         }
     }
 
     template <typename Samples>
     F64 Value(const Samples& fnSample) const {
-        constexpr double kadfDivisor[kTaps] = {5040, 720, 240, 144, 144, 240, 720, 5040};
+        constexpr Divisor kaoDivisor[kTaps] = {
+            MakeDivisor(5040), MakeDivisor(720), MakeDivisor(240), MakeDivisor(144),
+            MakeDivisor(144),  MakeDivisor(240), MakeDivisor(720), MakeDivisor(5040)};
         F64 term[kTaps];
         F64 node;
         for (int k = 0; k < kTaps; ++k) {
             const F64 p = fnSample(k);
-            term[k] = p * product[k] / Set1(kadfDivisor[k]);
+            term[k] = p * product[k];
             node = k == 3 ? p : node;
         }
+        DivideAll(term, kaoDivisor);
         const F64 value =
             term[1] - term[0] - term[2] + term[3] - term[4] + term[5] - term[6] + term[7];
         return Select(onNode, node, value);

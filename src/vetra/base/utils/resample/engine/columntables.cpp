@@ -58,13 +58,21 @@ ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
         const int nPix = std::min(kSpanPixels, nCols - nX);
         oPositions.Fill(oStages, nX, nPix, adfCol, adfRow);
         std::fill_n(adfRow, kSpanArray, 0.0);
-        oStages.pfnClasses(oFirstRow, oTask.nSrcCols, adfCol, adfRow, nPix,
-                           oColumns.vbyClass.data() + nX, oColumns.vnWindowCol.data() + nX,
-                           oColumns.vnNearestCol.data() + nX);
+        oStages.pfnClasses(oFirstRow, 0, adfCol, adfRow, nPix, oColumns.vbyClass.data() + nX,
+                           oColumns.vnWindowCol.data() + nX, oColumns.vnNearestCol.data() + nX);
         double* padfFrac = oColumns.vdfFrac.data() + nX;
         for (int i = 0; i < nPix; ++i) {
             padfFrac[i] =
                 adfCol[i] - std::floor(oLimits.bAnchorNearest ? adfCol[i] + 0.5 : adfCol[i]);
+        }
+    }
+    for (std::size_t i = 0; i < static_cast<std::size_t>(nCols); ++i) {
+        const unsigned char nClass = oColumns.vbyClass[i];
+        if ((nClass & kClassFits) != 0) {
+            oColumns.oReach.Add(oColumns.vnWindowCol[i]);
+        }
+        if ((nClass & kClassNear) != 0) {
+            oColumns.oReach.Add(oColumns.vnNearestCol[i]);
         }
     }
     oColumns.vnWindow = oColumns.vnWindowCol;

@@ -1,6 +1,7 @@
 #ifndef VETRA_BASE_UTILS_RESAMPLE_ENGINE_COLUMNTABLES_H
 #define VETRA_BASE_UTILS_RESAMPLE_ENGINE_COLUMNTABLES_H
 
+#include <algorithm>
 #include <cstdint>
 #include <vector>
 
@@ -8,6 +9,17 @@
 #include "vetra/base/utils/resample/engine/task.h"
 
 namespace vetra::utils::engine {
+
+/// The range of some numbers; of none, the first is behind the last.
+struct Reach {
+    std::int64_t nFirst = 0;
+    std::int64_t nLast = -1;
+
+    void Add(std::int64_t n) {
+        nFirst = nLast < 0 ? n : std::min(n, nFirst);
+        nLast = std::max(n, nLast);
+    }
+};
 
 /// What an axis-aligned run tabulates per target column, once. Places of columns outside the source
 /// are 0. All tables reach kSpanArray entries beyond the last column, so that groups of pixels can;
@@ -20,6 +32,8 @@ struct ColumnTables {
     std::vector<std::int64_t> vnWindow;
     std::vector<std::int64_t> vnNearest;
     std::vector<unsigned char> vbyClass;
+    // Of the windows that fit, where they begin, and of the nearest pixels that are inside.
+    Reach oReach;
     // Modes by the class of the row, where no mask has a say.
     std::vector<unsigned char> avbyMode[4];
     // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.

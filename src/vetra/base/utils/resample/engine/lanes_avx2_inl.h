@@ -57,6 +57,40 @@ inline F64 RoundEven(F64 a) {
 }
 inline F64 Sqrt(F64 a) { return {_mm256_sqrt_pd(a.lo), _mm256_sqrt_pd(a.hi)}; }
 
+inline F64 FusedMultiplyAdd(F64 a, F64 b, F64 c) {
+    return {_mm256_fmadd_pd(a.lo, b.lo, c.lo), _mm256_fmadd_pd(a.hi, b.hi, c.hi)};
+}
+template <int N>
+inline bool AnyTiny(const F64 (&x)[N]) {
+    // Every exponent from 2^-511 on has one of the two upper bits, here moved into bit 63.
+    const auto fnLarge = [](__m256d v) {
+        const __m256i n = _mm256_castpd_si256(v);
+        return _mm256_or_si256(_mm256_slli_epi64(n, 1), _mm256_slli_epi64(n, 2));
+    };
+    __m256i vLarge = _mm256_set1_epi64x(-1);
+    for (int k = 0; k < N; ++k) {
+        vLarge = _mm256_and_si256(vLarge, fnLarge(x[k].lo));
+        vLarge = _mm256_and_si256(vLarge, fnLarge(x[k].hi));
+    }
+    return _mm256_movemask_pd(_mm256_castsi256_pd(vLarge)) != 0xf && AnySmallNumber(x);
+}
+
+// Sums from the left within four.
+inline __m256d RunningSums4(__m256d v) {
+    // Within pairs, and then the first pair's to both of the second.
+    v = v + _mm256_shuffle_pd(_mm256_setzero_pd(), v, 0);
+    const __m256d vFirst = _mm256_permute4x64_pd(v, 0x50);
+    return v + _mm256_blend_pd(_mm256_setzero_pd(), vFirst, 0xc);
+}
+inline F64 RunningSums(F64 a) {
+    const __m256d lo = RunningSums4(a.lo);
+    return {lo, RunningSums4(a.hi) + _mm256_permute4x64_pd(lo, 0xff)};
+}
+inline F64 LastLane(F64 a) {
+    const __m256d v = _mm256_permute4x64_pd(a.hi, 0xff);
+    return {v, v};
+}
+
 inline unsigned Bits(B64 b) {
     return static_cast<unsigned>(_mm256_movemask_pd(b.lo) | _mm256_movemask_pd(b.hi) << 4);
 }
@@ -65,6 +99,15 @@ inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
                                      _mm_set1_epi8(static_cast<char>(nValue)));
     return {_mm256_castsi256_pd(_mm256_cvtepi8_epi64(v)),
             _mm256_castsi256_pd(_mm256_cvtepi8_epi64(_mm_srli_si128(v, 4)))};
+}
+
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    const auto fnHalf = [&](const unsigned char* q) {
+        const __m256i v = _mm256_loadu_si256(reinterpret_cast<const __m256i*>(q));
+        return static_cast<unsigned>(_mm256_movemask_epi8(
+            _mm256_cmpeq_epi8(v, _mm256_set1_epi8(static_cast<char>(nValue)))));
+    };
+    return std::uint64_t{fnHalf(p + 32)} << 32 | fnHalf(p);
 }
 
 inline F64 FromInt32(__m256i v) {
@@ -111,4 +154,15 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
 
-inline F64 GatherNear(const double* p, const std::int64_t* o) { return Gather(p, o); }
+inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
+    return Gather(p + nShift, o);
+}
+
+inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    return PickBits(panMap, panPlace);
+}
+inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
+    std::int64_t anPlace[kLanes];
+    StoreIntegers(anPlace, place);
+    return PickBits(panMap, anPlace);
+}

@@ -36,11 +36,42 @@ inline F64 RoundEven(F64 a) {
 
 inline F64 Sqrt(F64 a) { return {_mm512_sqrt_pd(a.v)}; }
 
+inline F64 FusedMultiplyAdd(F64 a, F64 b, F64 c) { return {_mm512_fmadd_pd(a.v, b.v, c.v)}; }
+template <int N>
+inline bool AnyTiny(const F64 (&x)[N]) {
+    // Every exponent from 2^-511 on has one of the two upper bits, here moved into bit 62.
+    __m512i vLarge = _mm512_castpd_si512(x[0].v);
+    vLarge = _mm512_or_si512(vLarge, _mm512_slli_epi64(vLarge, 1));
+    for (int k = 1; k < N; ++k) {
+        const __m512i v = _mm512_castpd_si512(x[k].v);
+        vLarge = _mm512_ternarylogic_epi64(vLarge, v, _mm512_slli_epi64(v, 1), 0xe0);
+    }
+    if (_mm512_testn_epi64_mask(vLarge, _mm512_set1_epi64(std::int64_t{1} << 62)) == 0) {
+        return false;
+    }
+    return AnySmallNumber(x);
+}
+
+inline F64 RunningSums(F64 a) {
+    const __m512i vZero = _mm512_setzero_si512();
+    __m512d v = a.v;
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 7));
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 6));
+    v = v + _mm512_castsi512_pd(_mm512_alignr_epi64(_mm512_castpd_si512(v), vZero, 4));
+    return {v};
+}
+inline F64 LastLane(F64 a) { return {_mm512_permutexvar_pd(_mm512_set1_epi64(kLanes - 1), a.v)}; }
+
 inline unsigned Bits(B64 b) { return b.m; }
 inline B64 BytesEqual(const unsigned char* p, unsigned char nValue) {
     const __mmask16 m = _mm_cmpeq_epi8_mask(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(p)),
                                             _mm_set1_epi8(static_cast<char>(nValue)));
     return {static_cast<__mmask8>(m)};
+}
+
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    return _mm512_cmpeq_epi8_mask(_mm512_loadu_si512(p),
+                                  _mm512_set1_epi8(static_cast<char>(nValue)));
 }
 
 inline F64 FromInt32(__m256i v) { return {_mm512_cvtepi32_pd(v)}; }
@@ -66,9 +97,21 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
     _mm512_storeu_si512(p, _mm512_cvttpd_epi64(a.v));
 }
 
-inline F64 GatherNear(const double* p, const std::int64_t* o) {
-    return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), _mm512_loadu_si512(o),
-                                   _mm512_loadu_pd(p + kLanes))};
+inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
+    const __m512i vPlace = _mm512_add_epi64(_mm512_loadu_si512(o), _mm512_set1_epi64(nShift));
+    return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), vPlace, _mm512_loadu_pd(p + kLanes))};
 }
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
+
+inline unsigned MapBits(const std::uint64_t* panMap, __m512i vPlace) {
+    const __m256i vWords = _mm512_i64gather_epi32(_mm512_srli_epi64(vPlace, 5), panMap, 4);
+    const __m256i vBit = _mm256_and_si256(_mm512_cvtepi64_epi32(vPlace), _mm256_set1_epi32(31));
+    return _mm256_test_epi32_mask(_mm256_srlv_epi32(vWords, vBit), _mm256_set1_epi32(1));
+}
+inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    return MapBits(panMap, _mm512_loadu_si512(panPlace));
+}
+inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
+    return MapBits(panMap, _mm512_cvttpd_epi64(place.v));
+}

@@ -346,3 +346,13 @@ inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* o) {
     const __m128i vFull = _mm_cmpeq_epi16(_mm_cmpeq_epi8(Gather16<1>(p, o), vZero), vZero);
     return static_cast<unsigned>(_mm_movemask_epi8(_mm_packs_epi16(vFull, vFull))) & 0xffu;
 }
+
+// With the reciprocal in two parts, high + low, x * high + x * low rounded once lies nearer to the
+// true quotient than 2^-50 of its last place, while no quotient by an integer up to 2^45 comes
+// nearer than 2^-46 to the middle of two doubles: so the rounding is that of a division
+// (Brisebarre, Muller, Raina: Accelerating correctly rounded floating-point division when the
+// divisor is known in advance, IEEE Transactions on Computers 53, 2004). Both parts are positive,
+// so signed zeros and infinities come out right as well.
+inline F64 DivideBy(F64 x, const Divisor& oDivisor) {
+    return FusedMultiplyAdd(x, Set1(oDivisor.dfHigh), x * Set1(oDivisor.dfLow));
+}

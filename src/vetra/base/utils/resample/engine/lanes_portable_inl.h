@@ -53,6 +53,33 @@ inline F64 ZeroWhere(B64 m, F64 a) {
     return a;
 }
 
+// Without a fused multiply-add nothing is gained by reciprocals.
+inline F64 DivideBy(F64 x, const Divisor& oDivisor) {
+    F64 r;
+    for (int i = 0; i < kParts; ++i) {
+        r.v[i] = x.v[i] / oDivisor.dfValue;
+    }
+    return r;
+}
+template <int N>
+inline bool AnyTiny(const F64 (&)[N]) {
+    return false;
+}
+
+inline F64 RunningSums(F64 a) {
+    double dfSum = 0.0;
+    for (int i = 0; i < kLanes; ++i) {
+        dfSum += a.v[i / 2][i % 2];
+        a.v[i / 2][i % 2] = dfSum;
+    }
+    return a;
+}
+inline F64 LastLane(F64 a) {
+    const double df = a.v[kParts - 1][1];
+    const Pair v{df, df};
+    return {{v, v, v, v}};
+}
+
 inline F64 Set1(double df) {
     const Pair v{df, df};
     return {{v, v, v, v}};
@@ -147,8 +174,8 @@ inline void GatherQuad(const T* p, const std::int64_t* panOffset, F64 (&q)[4]) {
         q[j] = Gather(p + j, panOffset);
     }
 }
-inline F64 GatherNear(const double* p, const std::int64_t* panOffset) {
-    return Gather(p, panOffset);
+inline F64 GatherNear(const double* p, const std::int64_t* panOffset, int nShift) {
+    return Gather(p + nShift, panOffset);
 }
 template <typename T>
 inline F64 LoadSamples(const T* p) {
@@ -182,6 +209,13 @@ inline void StoreSamples(T* p, F64 a) {
     }
 }
 
+inline std::uint64_t EqualBits(const unsigned char* p, unsigned char nValue) {
+    std::uint64_t nBits = 0;
+    for (int i = 0; i < 64; ++i) {
+        nBits |= std::uint64_t{p[i] == nValue} << i;
+    }
+    return nBits;
+}
 inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
                          unsigned char nValue) {
     unsigned nBits = 0;
@@ -192,4 +226,12 @@ inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
 }
 inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* panOffset) {
     return ~(ByteBits(p, panOffset, 0) | ByteBits(p + 1, panOffset, 0)) & 0xffu;
+}
+inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    return PickBits(panMap, panPlace);
+}
+inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
+    std::int64_t anPlace[kLanes];
+    StoreIntegers(anPlace, place);
+    return PickBits(panMap, anPlace);
 }

@@ -163,7 +163,8 @@ void MediansWith(const MedianRows& oRows, const WindowSize& oSize, int nPix, dou
 }
 
 template <typename T, bool kSquared>
-void Medians(const MedianRows& oRows, const WindowSize& oSize, int nPix, double* padfValue) {
+VETRA_STAGE void Medians(const MedianRows& oRows, const WindowSize& oSize, int nPix,
+                         double* padfValue) {
     if constexpr (sizeof(T) == 1) {
         if (oSize.nCols * oSize.nRows <= Lanes<unsigned char>::kMost) {
             MediansWith<T, unsigned char, kSquared>(oRows, oSize, nPix, padfValue);

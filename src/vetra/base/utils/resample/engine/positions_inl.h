@@ -1,7 +1,7 @@
 // The positions stage. Included inside a level's namespace; see stages_inl.h.
 
-void ArrayPositions(const float* pafCol, const float* pafRow, double dfColOff, double dfRowOff,
-                    int nPix, double* padfCol, double* padfRow) {
+VETRA_STAGE void ArrayPositions(const float* pafCol, const float* pafRow, double dfColOff,
+                                double dfRowOff, int nPix, double* padfCol, double* padfRow) {
     const F64 vColOff = Set1(dfColOff);
     const F64 vRowOff = Set1(dfRowOff);
     // Beyond the end of a page the processor's own prefetchers don't look.
@@ -21,8 +21,8 @@ void ArrayPositions(const float* pafCol, const float* pafRow, double dfColOff, d
     }
 }
 
-void BilinearPositions(const BilinearCorners& oCorners, std::int64_t nX, std::int64_t nY, int nPix,
-                       double* padfCol, double* padfRow) {
+VETRA_STAGE void BilinearPositions(const BilinearCorners& oCorners, std::int64_t nX,
+                                   std::int64_t nY, int nPix, double* padfCol, double* padfRow) {
     static const double kadfSteps[kLanes] = {0, 1, 2, 3, 4, 5, 6, 7};
     const F64 one = Set1(1.0);
     const bool bWide = oCorners.nCols > 1;

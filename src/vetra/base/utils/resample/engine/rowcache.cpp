@@ -12,95 +12,46 @@ constexpr int kWidestStrip = 2048;
 static_assert(kWidestStrip % kSpanPixels == 0);
 // What a thread keeps should fit into a part of the second-level cache.
 constexpr double kCacheBytes = 512.0 * 1024;
-// More than that is not kept at all.
-constexpr double kMostBytes = 64.0 * 1024 * 1024;
 // Source columns per target column beyond which rows hold too much that nobody reads.
 constexpr int kMostReduction = 8;
 
-// The row of the table that computes a method from rows of doubles.
-int RowIndex(const Task& oTask) {
-    const int nIndex = oTask.poMethod->eValues / 2;
-    // Without a mask there is nothing to replace.
-    return nIndex == eVR_CUBICPS / 2 && oTask.pabySrcMask == nullptr ? eVR_CUBIC / 2 : nIndex;
+// The row of the table that computes a method from rows of doubles. Where samples are replaced,
+// which depends on the pixel, only the windows without any come from rows.
+int RowIndex(const Method& oMethod) {
+    return (oMethod.eRule == ModeRule::eReplacingWindow ? PlainRow(oMethod) : oMethod.eValues) / 2;
 }
+
+// Whether sums of columns are worth adding up from the left: not for a few columns.
+bool SumsAddUp(const Method& oMethod) { return oMethod.oWindow.nCols > 8; }
 
 }  // namespace
 
 RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTables& oColumns) {
     const Method& oMethod = *oTask.poMethod;
-    if (oMethod.eValues == eVR_NONE || oMethod.eValues == eVR_CPLXSAR) {
-        return;
-    }
     mpoStages = &oStages;
-    mpoRows = &oStages.aoRows[RowIndex(oTask)];
+    if (oMethod.eValues != eVR_NONE && oMethod.eValues != eVR_CPLXSAR) {
+        moFacts.poRows = &oStages.aoRows[RowIndex(oMethod)];
+    }
     mbSquared = oMethod.eValues % 2 == 1;
+    moFacts.pfnMedians =
+        (mbSquared ? oStages.apfnSquaredMedians : oStages.apfnMedians)[oTask.nSrcType];
     mpadfFracCol = oColumns.vdfFrac.data();
+    // As wide as the cache allows.
     for (int nCols = kWidestStrip; nCols >= kSpanPixels; nCols /= 2) {
         MakeStrips(oTask, oColumns, nCols);
-        meKind = ChooseKind(oTask);
-        if (meKind == RowKind::eNone || GetRowBytes(oTask) <= kCacheBytes) {
-            return;
+        moPath = ChoosePath(oTask, moFacts);
+        if (GetKeptBytes(oTask, moFacts, moPath.ePath) <= kCacheBytes) {
+            break;
         }
     }
-    if (GetRowBytes(oTask) > kMostBytes) {
-        meKind = RowKind::eNone;
-    }
-}
-
-RowKind RowPlan::ChooseKind(const Task& oTask) const {
-    const Method& oMethod = *oTask.poMethod;
-    // Four samples are read sooner from the source than from rows that are made first, unless they
-    // are roots.
-    if (mpoRows->pfnValues == nullptr || mbReduces || oMethod.eValues == eVR_BILINEAR) {
-        return RowKind::eNone;
-    }
-    if (oMethod.eValues == eVR_AVERAGE && SumsAreExact(oTask)) {
-        return RowKind::eSums;
-    }
-    if (oMethod.eValues / 2 == eVR_MEDIAN / 2 && mbUnitSteps && oTask.nChan == 1 &&
-        mpoStages->apfnMedians[oTask.nSrcType] != nullptr &&
-        static_cast<double>(oMethod.oWindow.nCols) * oMethod.oWindow.nRows <= kMostMedianSamples) {
-        return RowKind::eMedians;
-    }
-    return mpoRows->pfnAcross != nullptr ? RowKind::eFiltered : RowKind::eDoubles;
-}
-
-// Whether no sum of a strip can be too large to be a whole number in double.
-bool RowPlan::SumsAreExact(const Task& oTask) const {
-    if (oTask.nSrcType >= gobs::eDT_32R) {
-        return false;  // floating, or 64 bits
-    }
-    const double dfGreatest = std::ldexp(1.0, 8 * kSampleBytes[oTask.nSrcType]);
-    return dfGreatest * oTask.poMethod->oWindow.nRows * static_cast<double>(mnWidest) <= 0x1p53;
-}
-
-// Of all that a thread keeps.
-double RowPlan::GetRowBytes(const Task& oTask) const {
-    const double dfDoubles = sizeof(double) * static_cast<double>(oTask.nChan);
-    const double dfWidest = static_cast<double>(mnWidest);
-    switch (meKind) {
-        case RowKind::eDoubles:
-            return dfDoubles * dfWidest * oTask.poMethod->oWindow.nRows;
-        case RowKind::eFiltered:
-            return dfDoubles * mnStripCols * oTask.poMethod->oWindow.nRows +
-                   (mpoRows->bTabulated ? sizeof(double) * static_cast<double>(mnStripCols) *
-                                              oTask.poMethod->oWindow.nCols
-                                        : 0.0);
-        case RowKind::eSums:
-            return 2 * dfDoubles * dfWidest;
-        case RowKind::eMedians:
-        case RowKind::eNone:
-            break;
-    }
-    return 0.0;
 }
 
 void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nStripCols) {
     const int nWndCols = oTask.poMethod->oWindow.nCols;
-    mnStripCols = nStripCols;
-    mnWidest = 0;
-    mbReduces = false;
-    mbUnitSteps = true;
+    moFacts.nStripCols = nStripCols;
+    moFacts.nStripSrcCols = 0;
+    moFacts.bReduces = false;
+    moFacts.bUnitSteps = true;
     mvoStrips.clear();
     mvoGroups.assign(static_cast<std::size_t>(oTask.nTgtCols) / kLanes + 1, PickGroup{});
     for (int nFirst = 0; nFirst < oTask.nTgtCols; nFirst += nStripCols) {
@@ -122,7 +73,8 @@ void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nS
                     oStrip.nSrcFirst = n;
                     oStrip.nFitFirst = i;
                 }
-                mbUnitSteps = mbUnitSteps && n - oStrip.nSrcFirst == i - oStrip.nFitFirst;
+                moFacts.bUnitSteps =
+                    moFacts.bUnitSteps && n - oStrip.nSrcFirst == i - oStrip.nFitFirst;
                 oStrip.nSrcFirst = std::min(n, oStrip.nSrcFirst);
                 nSrcLast = std::max(nSrcLast, n + nWndCols - 1);
                 ++oStrip.nFitCount;
@@ -131,8 +83,9 @@ void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nS
         if (nSrcLast >= 0) {
             oStrip.nSrcCount = nSrcLast - oStrip.nSrcFirst + 1;
         }
-        mbReduces = mbReduces || oStrip.nSrcCount > std::int64_t{kMostReduction} * oStrip.nNumCols +
-                                                        nWndCols + kLanes;
+        moFacts.bReduces =
+            moFacts.bReduces ||
+            oStrip.nSrcCount > std::int64_t{kMostReduction} * oStrip.nNumCols + nWndCols + kLanes;
         for (int i = nFirst; i < nFirst + oStrip.nNumCols; i += kLanes) {
             PickGroup& oGroup = mvoGroups[static_cast<std::size_t>(i / kLanes)];
             std::int64_t nLeast = -1;
@@ -142,13 +95,18 @@ void RowPlan::MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nS
                 }
             }
             oGroup.nFirst = nLeast < 0 ? 0 : nLeast - oStrip.nSrcFirst;
-            oGroup.bNear = true;
+            bool bNear = true;
+            bool bInARow = true;
             for (int k = 0; k < kLanes; ++k) {
                 oGroup.anOffset[k] = fnFits(i + k) ? fnSrcCol(i + k) - nLeast : 0;
-                oGroup.bNear = oGroup.bNear && oGroup.anOffset[k] < kNearReach;
+                bNear = bNear && oGroup.anOffset[k] + kNearColumns <= kNearReach;
+                bInARow = bInARow && oGroup.anOffset[k] == k;
             }
+            oGroup.eKind = bInARow ? PickGroup::eInARow
+                           : bNear ? PickGroup::eNear
+                                   : PickGroup::eAny;
         }
-        mnWidest = std::max(mnWidest, oStrip.nSrcCount);
+        moFacts.nStripSrcCols = std::max(moFacts.nStripSrcCols, oStrip.nSrcCount);
         mvoStrips.push_back(oStrip);
     }
 }
@@ -160,37 +118,38 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
       mnRows(static_cast<std::size_t>(moMethod.oWindow.nRows)) {
     const std::size_t nChan = static_cast<std::size_t>(oTask.nChan);
     const std::size_t nWndCols = static_cast<std::size_t>(moMethod.oWindow.nCols);
-    const std::size_t nSamples = static_cast<std::size_t>(oPlan.mnWidest) + kNearReach;
-    const std::size_t nStripCols = static_cast<std::size_t>(oPlan.mnStripCols) + kLanes;
+    const std::size_t nSamples = static_cast<std::size_t>(oPlan.moFacts.nStripSrcCols) + kNearReach;
+    const std::size_t nStripCols = static_cast<std::size_t>(oPlan.moFacts.nStripCols) + kLanes;
     mnRowDoubles = nSamples;
-    switch (oPlan.meKind) {
-        case RowKind::eMedians:
+    switch (oPlan.moPath.ePath) {
+        case Path::eMedians:
             mpabyCopy.reset(new char[mnRows * (nWndCols + kMedianReach) *
                                      static_cast<std::size_t>(kSampleBytes[oTask.nSrcType])]);
             mvpRow.resize(mnRows);
             mvpCopy.resize(mnRows);
             return;
-        case RowKind::eSums:
+        case Path::eSums:
             // Per channel the sums of the columns, and those added up.
-            mpadfKept.reset(new double[nChan * 2 * mnRowDoubles]());
+            mpadfKept = MakeAlignedDoubles(nChan * 2 * mnRowDoubles);
             mvpadfRow.resize(nChan);
             for (std::size_t c = 0; c < nChan; ++c) {
-                mvpadfRow[c] = mpadfKept.get() + (2 * c + 1) * mnRowDoubles;
+                mvpadfRow[c] =
+                    mpadfKept.get() + (2 * c + (SumsAddUp(moMethod) ? 1 : 0)) * mnRowDoubles;
             }
             break;
-        case RowKind::eFiltered:
+        case Path::eFilteredRows:
             mnRowDoubles = nStripCols;
-            mpadfSamples.reset(new double[nSamples]());
-            if (oPlan.mpoRows->bTabulated) {
-                mpadfTaps.reset(new double[nStripCols * nWndCols]);
+            mpadfSamples = MakeAlignedDoubles(nSamples);
+            if (oPlan.moFacts.poRows->bTabulated) {
+                mpadfTaps = MakeAlignedDoubles(nStripCols * nWndCols);
             }
             [[fallthrough]];
         default:
-            mpadfKept.reset(new double[nChan * mnRows * mnRowDoubles]());
+            mpadfKept = MakeAlignedDoubles(nChan * mnRows * mnRowDoubles);
             mvnSrcRow.assign(mnRows, -1);
             mvpadfRow.resize(nChan * mnRows);
             if (moMethod.eScratch != Scratch::eNone) {
-                mpadfScratch.reset(new double[GetScratchSize(moMethod)]);
+                mpadfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
             }
             break;
     }
@@ -211,11 +170,11 @@ void RowCache::SetStrip(const Strip& oStrip) {
 
 void RowCache::SetWindowRow(std::int64_t nSrcRow, double dfFracRow) {
     moWindows.dfFracRow = dfFracRow;
-    if (moPlan.meKind == RowKind::eSums) {
+    if (moPlan.moPath.ePath == Path::eSums) {
         MoveSums(nSrcRow);
     }
     mnWindowRow = nSrcRow;
-    if (moPlan.meKind == RowKind::eSums || moPlan.meKind == RowKind::eMedians) {
+    if (moPlan.moPath.ePath == Path::eSums || moPlan.moPath.ePath == Path::eMedians) {
         return;
     }
     for (std::size_t k = 0; k < mnRows; ++k) {
@@ -251,7 +210,7 @@ void RowCache::Fetch(std::int64_t nSrcRow, std::size_t nSlot) {
         apfnWiden[moTask.nSrcType](SrcSamples(nSrcRow, c), moTask.nChan, moStrip.nSrcCount,
                                    padfSamples);
         if (mpadfSamples != nullptr) {
-            moPlan.mpoRows->pfnAcross(oWindows, padfSamples, padfKept);
+            moPlan.moFacts.poRows->pfnAcross(oWindows, padfSamples, padfKept);
         }
     }
 }
@@ -266,25 +225,27 @@ void RowCache::MoveSums(std::int64_t nSrcRow) {
     const LevelStages& oStages = *moPlan.mpoStages;
     for (int c = 0; c < moTask.nChan; ++c) {
         double* padfSum = mpadfKept.get() + 2 * static_cast<std::size_t>(c) * mnRowDoubles;
-        const auto fnApply = [&](const AddRowFunction* apfnRow, std::int64_t nBegin,
-                                 std::int64_t nEnd) {
-            for (std::int64_t n = nBegin; n < nEnd; ++n) {
-                apfnRow[moTask.nSrcType](SrcSamples(n, c), moTask.nChan, moStrip.nSrcCount,
-                                         padfSum);
+        // Rows come and rows leave, in pairs as far as they go.
+        const auto fnChange = [&](std::int64_t nAdd, std::int64_t nAddEnd, std::int64_t nSubtract,
+                                  std::int64_t nSubtractEnd) {
+            while (nAdd < nAddEnd || nSubtract < nSubtractEnd) {
+                oStages.apfnAddRow[moTask.nSrcType](
+                    nAdd < nAddEnd ? SrcSamples(nAdd++, c) : nullptr,
+                    nSubtract < nSubtractEnd ? SrcSamples(nSubtract++, c) : nullptr, moTask.nChan,
+                    moStrip.nSrcCount, padfSum);
             }
         };
-        if (bNear) {
-            // Rows below come and rows above leave, or the other way round.
-            fnApply(oStages.apfnAddRow, std::max(nSrcRow, mnWindowRow + nRows), nSrcRow + nRows);
-            fnApply(oStages.apfnAddRow, nSrcRow, std::min(mnWindowRow, nSrcRow + nRows));
-            fnApply(oStages.apfnSubtractRow, mnWindowRow, std::min(nSrcRow, mnWindowRow + nRows));
-            fnApply(oStages.apfnSubtractRow, std::max(mnWindowRow, nSrcRow + nRows),
-                    mnWindowRow + nRows);
-        } else {
+        if (!bNear) {
             std::fill_n(padfSum, moStrip.nSrcCount, 0.0);
-            fnApply(oStages.apfnAddRow, nSrcRow, nSrcRow + nRows);
+            fnChange(nSrcRow, nSrcRow + nRows, 0, 0);
+        } else if (nSrcRow >= mnWindowRow) {
+            fnChange(mnWindowRow + nRows, nSrcRow + nRows, mnWindowRow, nSrcRow);
+        } else {
+            fnChange(nSrcRow, mnWindowRow, nSrcRow + nRows, mnWindowRow + nRows);
         }
-        oStages.pfnAddUp(padfSum, moStrip.nSrcCount, padfSum + mnRowDoubles);
+        if (SumsAddUp(moMethod)) {
+            oStages.pfnAddUp(padfSum, moStrip.nSrcCount, padfSum + mnRowDoubles);
+        }
     }
 }
 
@@ -299,30 +260,29 @@ void RowCache::ComputeMedians(int nFirstCol, int nNumCols) {
         mvpRow[k] = SrcSamples(mnWindowRow + static_cast<std::int64_t>(k), 0) +
                     std::ptrdiff_t{nFirst - moStrip.nFitFirst} * kSampleBytes[moTask.nSrcType];
     }
-    const auto& apfnMedians =
-        moPlan.mbSquared ? moPlan.mpoStages->apfnSquaredMedians : moPlan.mpoStages->apfnMedians;
-    apfnMedians[moTask.nSrcType]({mvpRow.data(), mpabyCopy.get(), mvpCopy.data()},
-                                 *static_cast<const WindowSize*>(moTask.pParameters),
-                                 nLast - nFirst, madfValue + (nFirst - nFirstCol));
+    moPlan.moFacts.pfnMedians({mvpRow.data(), mpabyCopy.get(), mvpCopy.data()},
+                              *static_cast<const WindowSize*>(moTask.pParameters), nLast - nFirst,
+                              madfValue + (nFirst - nFirstCol));
 }
 
 double* RowCache::GetValues(int nChannel, int nFirstCol, int nNumCols) {
-    if (moPlan.meKind == RowKind::eMedians) {
+    if (moPlan.moPath.ePath == Path::eMedians) {
         ComputeMedians(nFirstCol, nNumCols);
         return madfValue;
     }
     // Whole groups of the strip.
     const int nFirst = nFirstCol / kLanes * kLanes;
-    const std::size_t nChannelRows = moPlan.meKind == RowKind::eSums ? 1 : mnRows;
+    const std::size_t nChannelRows = moPlan.moPath.ePath == Path::eSums ? 1 : mnRows;
     moWindows.papdfRow = mvpadfRow.data() + static_cast<std::size_t>(nChannel) * nChannelRows;
     moWindows.poGroups = moPlan.mvoGroups.data() + nFirst / kLanes;
     moWindows.padfFracCol = moPlan.mpadfFracCol + nFirst;
     moWindows.nPix = nFirstCol - nFirst + nNumCols;
     moWindows.nFirst = nFirst - moStrip.nFirstCol;
-    const RowValuesFunction pfnValues = moPlan.meKind == RowKind::eSums
-                                            ? moPlan.mpoStages->pfnSumValues
-                                        : moPlan.mbSquared ? moPlan.mpoRows->pfnSquaredValues
-                                                           : moPlan.mpoRows->pfnValues;
+    const RowValuesFunction pfnValues =
+        moPlan.moPath.ePath == Path::eSums ? (SumsAddUp(moMethod) ? moPlan.mpoStages->pfnTotalValues
+                                                                  : moPlan.mpoStages->pfnSumValues)
+        : moPlan.mbSquared                 ? moPlan.moFacts.poRows->pfnSquaredValues
+                                           : moPlan.moFacts.poRows->pfnValues;
     pfnValues(moWindows, madfValue);
     return madfValue + (nFirstCol - nFirst);
 }

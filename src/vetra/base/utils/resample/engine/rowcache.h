@@ -6,7 +6,9 @@
 #include <memory>
 #include <vector>
 
+#include "vetra/base/utils/resample/engine/aligneddoubles.h"
 #include "vetra/base/utils/resample/engine/columntables.h"
+#include "vetra/base/utils/resample/engine/path.h"
 #include "vetra/base/utils/resample/engine/task.h"
 
 namespace vetra::utils::engine {
@@ -22,43 +24,27 @@ struct Strip {
     int nFitCount = 0;
 };
 
-/// What is kept of the source's rows.
-enum class RowKind {
-    eNone,      ///< nothing: each window reads the source
-    eDoubles,   ///< samples, or their roots, as doubles
-    eFiltered,  ///< what a separable method makes of those along the columns
-    eSums,      ///< sums of integers over the rows of a window, added up along the columns
-    eMedians,   ///< nothing; but the windows are those of neighbours, and read together
-};
-
 /// Target columns cut into strips, whose rows of doubles stay in the cache while the target rows
 /// walk down the source.
 class RowPlan {
  public:
-    /// Empty where rows of doubles are no use: the method can't work on them, or the windows leave
-    /// most source columns out, or they are too large to be kept.
+    /// Empty: of a run that isn't axis-aligned.
     RowPlan() = default;
     RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTables& oColumns);
 
-    RowKind GetKind() const { return meKind; }
+    /// Path::eColumns where no rows are kept.
+    const PathChoice& GetPath() const { return moPath; }
     const std::vector<Strip>& GetStrips() const { return mvoStrips; }
 
  private:
     friend class RowCache;
 
     void MakeStrips(const Task& oTask, const ColumnTables& oColumns, int nStripCols);
-    RowKind ChooseKind(const Task& oTask) const;
-    bool SumsAreExact(const Task& oTask) const;
-    double GetRowBytes(const Task& oTask) const;
 
-    RowKind meKind = RowKind::eNone;
+    PathChoice moPath;
+    PathFacts moFacts{};
     const LevelStages* mpoStages = nullptr;
-    const RowStages* mpoRows = nullptr;
     bool mbSquared = false;
-    int mnStripCols = 0;
-    std::int64_t mnWidest = 0;  ///< source columns of a strip
-    bool mbReduces = false;     ///< most source columns are in no window
-    bool mbUnitSteps = false;   ///< each window begins one column behind the one before
     std::vector<Strip> mvoStrips;
     /// Counted from the first source column of the group's strip.
     std::vector<PickGroup> mvoGroups;
@@ -92,10 +78,10 @@ class RowCache {
     std::size_t mnRowDoubles;  // of a kept row
     Strip moStrip;
     RowWindows moWindows{};
-    std::unique_ptr<double[]> mpadfKept;  // [channels][rows]
-    std::unique_ptr<double[]> mpadfSamples;
-    std::unique_ptr<double[]> mpadfTaps;
-    std::unique_ptr<double[]> mpadfScratch;
+    AlignedDoubles mpadfKept;  // [channels][rows]
+    AlignedDoubles mpadfSamples;
+    AlignedDoubles mpadfTaps;
+    AlignedDoubles mpadfScratch;
     std::vector<std::int64_t> mvnSrcRow;  // which is in each slot
     std::vector<const double*> mvpadfRow;
     std::int64_t mnWindowRow = -1;

@@ -4,7 +4,7 @@
 
 // A stretch of one channel of a source row as doubles, or as their roots.
 template <typename T, bool kRoots>
-void Widen(const void* pSrc, int nChan, std::int64_t nCount, double* padf) {
+VETRA_STAGE void Widen(const void* pSrc, int nChan, std::int64_t nCount, double* padf) {
     const T* p = static_cast<const T*>(pSrc);
     std::int64_t anOffset[kLanes];
     for (int i = 0; i < kLanes; ++i) {
@@ -27,16 +27,23 @@ template <typename Function>
 inline void ForEachRowGroup(const RowWindows& oRows, const Function& fnGroup) {
     for (int i = 0; i < oRows.nPix; i += kLanes) {
         const PickGroup& oGroup = oRows.poGroups[i / kLanes];
-        if (oGroup.bNear) {
-            fnGroup(i, RowReader<true>{oRows, oGroup});
-        } else {
-            fnGroup(i, RowReader<false>{oRows, oGroup});
+        switch (oGroup.eKind) {
+            case PickGroup::eInARow:
+                fnGroup(i, RowReader<PickGroup::eInARow>{oRows, oGroup});
+                break;
+            case PickGroup::eNear:
+                fnGroup(i, RowReader<PickGroup::eNear>{oRows, oGroup});
+                break;
+            default:
+                fnGroup(i, RowReader<PickGroup::eAny>{oRows, oGroup});
+                break;
         }
     }
 }
 
 // Taps of each group's columns, nCols x kLanes of them.
-void ColumnTaps(const void* pParameters, const double* padfFracCol, int nPix, double* padfTaps) {
+VETRA_STAGE void ColumnTaps(const void* pParameters, const double* padfFracCol, int nPix,
+                            double* padfTaps) {
     const KernelTables& oTables = *static_cast<const KernelTables*>(pParameters);
     for (int i = 0; i < nPix; i += kLanes) {
         GatherAcrossTaps(oTables, Load(padfFracCol + i), padfTaps);
@@ -46,7 +53,7 @@ void ColumnTaps(const void* pParameters, const double* padfFracCol, int nPix, do
 
 // One row, filtered along the columns.
 template <typename Filter>
-void Across(const RowWindows& oRows, const double* padfRow, double* padfFiltered) {
+VETRA_STAGE void Across(const RowWindows& oRows, const double* padfRow, double* padfFiltered) {
     int nTaps = Filter::kTaps;
     if constexpr (Filter::kTabulated) {
         nTaps = static_cast<const KernelTables*>(oRows.pParameters)->nCols;
@@ -68,13 +75,19 @@ inline void StoreRowValue(double* p, F64 value) {
 
 // Values from filtered rows.
 template <typename Filter, bool kSquared>
-void Down(const RowWindows& oRows, double* padfValue) {
+VETRA_STAGE void Down(const RowWindows& oRows, double* padfValue) {
     const F64 dy = Set1(oRows.dfFracRow);
     FilterInput oInput{dy, oRows.padfScratch, Filter::kTaps};
     if constexpr (Filter::kTabulated) {
         const KernelTables& oTables = *static_cast<const KernelTables*>(oRows.pParameters);
         GatherDownTaps(oTables, dy, oRows.padfScratch);
         oInput.nTaps = oTables.nRows;
+    }
+    // A copy that no store can reach stays in registers.
+    double adfTaps[Filter::kTabulated && Filter::kTaps != kAnySize ? Filter::kTaps * kLanes : 1];
+    if constexpr (sizeof adfTaps > sizeof(double)) {
+        __builtin_memcpy(adfTaps, oRows.padfScratch, sizeof adfTaps);
+        oInput.padfTaps = adfTaps;
     }
     const Filter oDown(oInput);
     for (int i = 0; i < oRows.nPix; i += kLanes) {
@@ -86,7 +99,7 @@ void Down(const RowWindows& oRows, double* padfValue) {
 
 // Values of a method that isn't separable, from whole rows.
 template <typename Method, bool kSquared>
-void RowValues(const RowWindows& oRows, double* padfValue) {
+VETRA_STAGE void RowValues(const RowWindows& oRows, double* padfValue) {
     const F64 dy = Set1(oRows.dfFracRow);
     ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
         StoreRowValue<kSquared>(padfValue + i,

@@ -13,8 +13,12 @@ namespace vetra::utils::engine {
 constexpr int kSpanPixels = 256;
 /// Pixels that the lane layer treats at once.
 constexpr int kLanes = 8;
+/// Of arrays that are read in whole groups: those then lie in one cache line each.
+constexpr int kAlignment = 64;
 /// Size of a span's arrays: stages may write up to the end of the last group.
 constexpr int kSpanArray = kSpanPixels + kLanes;
+/// Channels whose values a stage may make at once.
+constexpr int kMostChannelsAtOnce = 4;
 
 /// The ten real sample types, by type code.
 constexpr int kNumSampleTypes = 10;
@@ -38,14 +42,40 @@ struct ClassLimits {
     double dfRowOff;
 };
 
+/// Least and greatest columns and rows of some positions. Of none, the first is behind the last.
+struct PositionBounds {
+    double dfFirstCol;
+    double dfLastCol;
+    double dfFirstRow;
+    double dfLastRow;
+};
+
 /// The source mask, as a run's windows see it.
 struct MaskWindow {
+    /// A bit for each window, set where it is whole, and one for each nearest pixel, set where it
+    /// may be used; or null, and the bytes are looked at.
+    const std::uint64_t* panWhole;
+    const std::uint64_t* panUsable;
     const unsigned char* pabyWindow;
     const unsigned char* pabyNearest;
     int nSrcCols;
     int nWndCols;
-    int nWndRows;
+    int nWndRows;  ///< 0 where it doesn't matter whether windows are whole
     bool bExactlyOne;
+    /// The mode of each class, where they are the same for all pixels; or null, and what comes out
+    /// are classes.
+    const unsigned char* pabyModeOfClass;
+};
+
+/// Of each pixel of a span what becomes of it, and the places of its window and nearest pixel.
+struct SpanPlaces {
+    unsigned char* pabyClassThenMode;
+    /// 1 for pixels whose windows fit but aren't whole, else 0. May be null.
+    unsigned char* pabyBroken;
+    std::int64_t* panWindow;
+    std::int64_t* panNearest;
+    double* padfFracCol;
+    double* padfFracRow;
 };
 
 /// Corner positions of a bilinear transform, and its size.
@@ -61,12 +91,17 @@ struct PickGroup {
     /// Of each column's window, the place of the first sample, counted from nFirst.
     alignas(64) std::int64_t anOffset[kLanes];
     std::int64_t nFirst;
-    bool bNear;  ///< all places are below kNearReach
+    enum Kind : unsigned char {
+        eAny,
+        eNear,    ///< all places, and the three behind each, are below kNearReach
+        eInARow,  ///< place k is k
+    } eKind;
 };
 constexpr int kNearReach = 16;
+constexpr int kNearColumns = 4;
 
 /// Windows of a stretch of one target row, over rows of doubles. A row has kNearReach doubles more
-/// than the windows need.
+/// than the windows need; filtered rows begin at multiples of kAlignment bytes.
 struct RowWindows {
     const double* const* papdfRow;  ///< of the windows, in order
     int nFirst;                     ///< place of the first pixel in rows that are filtered already
@@ -165,8 +200,8 @@ struct StoreLimits {
 };
 
 /// Computes an array of kSpanPixels values from the samples of one channel, or, for a method that
-/// takes two channels at once, two arrays kSpanArray apart. pSrc points at the (first) channel's
-/// first sample.
+/// takes several channels at once, as many arrays kSpanArray apart. pSrc points at the (first)
+/// channel's first sample.
 using ValuesFunction = void (*)(const WindowSpan& oSpan, const void* pSrc, double* padfValue);
 /// Makes doubles of nCount samples, nChan apart.
 using WidenFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padf);
@@ -175,9 +210,10 @@ using AcrossFunction = void (*)(const RowWindows& oRows, const double* padfRow,
                                 double* padfFiltered);
 /// Computes the values of all pixels of oRows.
 using RowValuesFunction = void (*)(const RowWindows& oRows, double* padfValue);
-/// Adds a stretch of one channel of a source row to sums, or takes it away: nCount samples, nChan
-/// apart.
-using AddRowFunction = void (*)(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum);
+/// Adds a stretch of one channel of a source row to sums, or takes it away, or adds one and takes
+/// another away: nCount samples, nChan apart.
+using AddRowFunction = void (*)(const void* pAdd, const void* pSubtract, int nChan,
+                                std::int64_t nCount, double* padfSum);
 /// Computes the medians of nPix windows at unit scale.
 using MediansFunction = void (*)(const MedianRows& oRows, const WindowSize& oSize, int nPix,
                                  double* padfValue);
@@ -190,6 +226,9 @@ using StoreFunction = void (*)(const double* padfValue, int nPix, const void* pL
 /// Copies the pixels at panOffset, all channels, to pTgt.
 using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
                               void* pTgt);
+/// Writes nPix pixels of three or four channels, whose samples lie in arrays of kSpanArray one
+/// behind the other.
+using InterleaveFunction = void (*)(const void* pSamples, int nPix, void* pTgt);
 /// Clamps samples of an integer type in place.
 using ClampFunction = void (*)(void* pSamples, std::int64_t nSamples, const void* pLimits);
 
@@ -240,15 +279,32 @@ struct LevelStages {
 
     // Modes.
     /// Class bits of each position, and the source pixels at which its window and its nearest pixel
-    /// stand: their indices, with nSrcCols pixels in a row, or 0 where they are outside.
-    void (*pfnClasses)(const ClassLimits& oLimits, int nSrcCols, const double* padfCol,
+    /// stand: their indices, with nPitch entries in a row, or 0 where they are outside.
+    void (*pfnClasses)(const ClassLimits& oLimits, std::int64_t nPitch, const double* padfCol,
                        const double* padfRow, int nPix, unsigned char* pabyClass,
                        std::int64_t* panWindow, std::int64_t* panNearest);
     /// Takes masked pixels out of the classes: the window bit where the window holds a mask byte of
     /// 0, the nearest bit where that pixel's byte is 0 (bExactlyOne: is not 1). The masks are
     /// those of the window and of the nearest pixel to which an index of 0 leads.
-    void (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                           const std::int64_t* panNearest, int nPix, unsigned char* pabyClass);
+    /// Returns the set of what it wrote (1 << class or mode).
+    unsigned (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
+                               const std::int64_t* panNearest, int nPix,
+                               unsigned char* pabyClassThenMode);
+    /// Bits of nCount mask bytes, set where they are nValue (bEqual) or aren't; and zeros up to a
+    /// whole word.
+    void (*pfnMaskBits)(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
+                        bool bEqual, std::uint64_t* panBits);
+    PositionBounds (*pfnBounds)(const double* padfCol, const double* padfRow, int nPix);
+    /// Classes or modes, where bits of the mask are known, and places: as pfnClasses,
+    /// pfnMaskClasses, pfnWindows and pfnNearestPlaces, but places are given for all windows that
+    /// fit, and nearest ones only in groups in which the class of one pixel depends on it.
+    unsigned (*pfnMappedPlaces)(const ClassLimits& oLimits, const MaskWindow& oWindow,
+                                std::int64_t nBitPitch, double dfPitch, double dfChan,
+                                const double* padfCol, const double* padfRow, int nPix,
+                                const SpanPlaces& oPlaces);
+    /// Writes 1 for those of nPix pixels whose mode is 1 and whose windows aren't whole, else 0.
+    void (*pfnBrokenWindows)(const std::uint64_t* panWhole, const std::int64_t* panWindow,
+                             const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
     /// of modes (1 << mode).
@@ -269,18 +325,21 @@ struct LevelStages {
 
     // Values and stores, by sample type.
     ValuesFunction apfnValues[kNumValues][kNumSampleTypes];
+    /// Bilinear values of three and of four channels at once.
+    ValuesFunction apfnBilinearPixels[2][kNumSampleTypes];
     WidenFunction apfnWiden[kNumSampleTypes];
     /// Makes the roots of the samples.
     WidenFunction apfnWidenRoots[kNumSampleTypes];
     /// The taps of a row's groups, by which rows are filtered.
     void (*pfnColumnTaps)(const void* pParameters, const double* padfFracCol, int nPix,
                           double* padfTaps);
-    /// Means of integers: rows are added to the sums of columns, or taken away; those are added up
-    /// from the left, n + 1 of them; the last stage takes what it needs of them as one row.
+    /// Means of integers: rows are added to the sums of columns (pSubtract may be null), or taken
+    /// away (pAdd is null). Sums of many columns are added up from the left, n + 1 of them; the
+    /// last stages take what they need from one row, of either sums.
     AddRowFunction apfnAddRow[kNumSampleTypes];
-    AddRowFunction apfnSubtractRow[kNumSampleTypes];
     void (*pfnAddUp)(const double* padfSum, std::int64_t nCount, double* padfTotal);
     RowValuesFunction pfnSumValues;
+    RowValuesFunction pfnTotalValues;
     /// Medians, and squared ones; null for most types.
     MediansFunction apfnMedians[kNumSampleTypes];
     MediansFunction apfnSquaredMedians[kNumSampleTypes];
@@ -290,6 +349,8 @@ struct LevelStages {
     /// With 0 in the place of negative samples.
     NearestFunction apfnNonNegativeNearest[kNumSampleTypes];
     StoreFunction apfnStore[kNumSampleTypes];
+    /// Of three and of four channels.
+    InterleaveFunction apfnInterleave[2][kNumSampleTypes];
     /// Null for the types whose samples may change on their way through a double.
     CopyFunction apfnCopy[kNumSampleTypes];
     ClampFunction apfnClamp[kNumSampleTypes];

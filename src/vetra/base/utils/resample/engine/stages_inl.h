@@ -9,17 +9,24 @@
 // offers
 //   F64, B64                     eight doubles; eight truth values
 //   + - * / <= < > == & Select   lane by lane; a comparison with NaN is false
+//   DivideBy                     division by a Divisor, of numbers that are not tiny
+//   AnyTiny                      whether there are any that DivideBy can't divide: below 2^-511 in
+//                                size, except 0
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
+//   RunningSums LastLane         sums from the left, up to each lane; the last lane in all
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
+//   MapBits                      bits: which of eight numbers a map of bits has
+//   EqualBits                    bits: which of 64 bytes have a value
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
 //   ShufflePairs                 pairs of samples out of sixteen, as a PairGroup says
 //   GatherQuad                   four adjacent samples at eight offsets
-//   GatherNear                   doubles at eight offsets below kNearReach
+//   GatherNear                   doubles at eight offsets and a shift below kNearColumns, together
+//                                below kNearReach
 //   LoadSamples                  eight adjacent samples
 //   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
 //   StoreSamples                 eight values that T can hold (float: rounds to nearest)
@@ -35,10 +42,20 @@
 
 static_assert(FLT_EVAL_METHOD == 0, "double arithmetic must be done in double");
 
+// A stage is one function: with so many of them in a source, GCC stops inlining lane operations at
+// some point. Plain processors have more operations for each lane operation, which would take long
+// to compile and gain little.
+#if defined(__GNUC__) && !defined(__clang__) && defined(__AVX2__)
+#define VETRA_STAGE [[gnu::flatten]]
+#else
+#define VETRA_STAGE
+#endif
+
 namespace vetra::utils::engine::VETRA_LEVEL {
 
 namespace {
 
+#include "vetra/base/utils/resample/engine/scalars_inl.h"
 #include VETRA_LANES
 
 // In this order: each uses names of those before it.
@@ -82,18 +99,19 @@ namespace {
     }
 #define VETRA_VALUES(Method, T) &Values<Method, T>
 #define VETRA_COMPLEX_VALUES(Method, T) &ComplexValues<Method, T>
+#define VETRA_PIXELS(kNumChan, T) &BilinearPixels<kNumChan, T>
 #define VETRA_TWINS(Name, Method) \
     VETRA_PER_TYPE(VETRA_VALUES, Method, ), VETRA_PER_TYPE(VETRA_VALUES, Squared<Method>, ),
 #define VETRA_ROWS(Name, Method) RowStagesOf<Method>::kStages,
 #define VETRA_WIDEN(T) &Widen<T, false>
 #define VETRA_WIDEN_ROOTS(T) &Widen<T, true>
-#define VETRA_ADD_ROW(T) &AddRow<T, true>
-#define VETRA_SUBTRACT_ROW(T) &AddRow<T, false>
+#define VETRA_ADD_ROW(T) &AddRow<T>
 #define VETRA_MEDIANS(T) &Medians<T, false>
 #define VETRA_SQUARED_MEDIANS(T) &Medians<T, true>
 #define VETRA_NEAREST(T) &NearestValues<T, false>
 #define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
+#define VETRA_INTERLEAVE(kNumChan, T) &Interleave<kNumChan, T>
 #define VETRA_COPY(T) &CopyPixels<T>
 #define VETRA_CLAMP(T) &ClampSamples<T>
 
@@ -107,23 +125,29 @@ const LevelStages kStages = {
     &BilinearPositions,
     &Classes,
     &MaskClasses,
+    &MaskBits,
+    &Bounds,
+    &MappedPlaces,
+    &BrokenWindows,
     &OpenModes,
     &Windows,
     &NearestPlaces,
     {VETRA_VALUES_ROWS(VETRA_TWINS) VETRA_PER_TYPE(VETRA_COMPLEX_VALUES, CplxSar, )},
+    {VETRA_PER_TYPE(VETRA_PIXELS, 3, ), VETRA_PER_TYPE(VETRA_PIXELS, 4, )},
     VETRA_PER_TYPE(VETRA_WIDEN),
     VETRA_PER_TYPE(VETRA_WIDEN_ROOTS),
     &ColumnTaps,
     VETRA_PER_TYPE(VETRA_ADD_ROW),
-    VETRA_PER_TYPE(VETRA_SUBTRACT_ROW),
     &AddUp,
     &SumValues,
+    &TotalValues,
     VETRA_PER_SMALL_INTEGER(VETRA_MEDIANS),
     VETRA_PER_SMALL_INTEGER(VETRA_SQUARED_MEDIANS),
     {VETRA_VALUES_ROWS(VETRA_ROWS)},
     VETRA_PER_TYPE(VETRA_NEAREST),
     VETRA_PER_TYPE(VETRA_NONNEGATIVE),
     VETRA_PER_TYPE(VETRA_STORE),
+    {VETRA_PER_TYPE(VETRA_INTERLEAVE, 3, ), VETRA_PER_TYPE(VETRA_INTERLEAVE, 4, )},
     VETRA_PER_SHORT_INTEGER(VETRA_COPY),
     VETRA_PER_SHORT_INTEGER(VETRA_CLAMP),
 };

@@ -62,7 +62,8 @@ void StoreInteger64(const double* padfValue, int nPix, const StoreLimits<T>& oLi
 }
 
 template <typename T>
-void StoreValues(const double* padfValue, int nPix, const void* pLimits, void* pSamples) {
+VETRA_STAGE void StoreValues(const double* padfValue, int nPix, const void* pLimits,
+                             void* pSamples) {
     const StoreLimits<T>& oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
     T* p = static_cast<T*>(pSamples);
     if constexpr (kIsFloating<T>) {
@@ -74,8 +75,20 @@ void StoreValues(const double* padfValue, int nPix, const void* pLimits, void* p
     }
 }
 
+template <int kNumChan, typename T>
+VETRA_STAGE void Interleave(const void* pSamples, int nPix, void* pTgt) {
+    const T* __restrict p = static_cast<const T*>(pSamples);
+    T* __restrict t = static_cast<T*>(pTgt);
+    for (int i = 0; i < nPix; ++i) {
+        for (int c = 0; c < kNumChan; ++c) {
+            t[i * kNumChan + c] = p[c * kSpanArray + i];
+        }
+    }
+}
+
 template <typename T>
-void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan, void* pTgt) {
+VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
+                            void* pTgt) {
     const T* p = static_cast<const T*>(pSrc);
     T* t = static_cast<T*>(pTgt);
     if (nChan == 1) {
@@ -97,7 +110,7 @@ void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int n
 }
 
 template <typename T>
-void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
+VETRA_STAGE void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
     const StoreLimits<T> oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
     T* p = static_cast<T*>(pSamples);
     for (std::int64_t i = 0; i < nSamples; ++i) {

@@ -4,55 +4,83 @@
 // Sums of integers are exact in double whatever their order, so they may be kept running: of each
 // source column over the rows of a window, and over the columns from the left.
 
-// Adds a stretch of one channel of a source row to the sums of its columns, or takes it away.
-template <typename T, bool kAdd>
-void AddRow(const void* pSrc, int nChan, std::int64_t nCount, double* padfSum) {
-    const T* p = static_cast<const T*>(pSrc);
+// What a row or two change in the sums of columns.
+template <typename T, bool kAdd, bool kSubtract>
+inline void ChangeSums(const T* pAdd, const T* pSubtract, int nChan, std::int64_t nCount,
+                       double* padfSum) {
     std::int64_t anOffset[kLanes];
     for (int i = 0; i < kLanes; ++i) {
         anOffset[i] = static_cast<std::int64_t>(i) * nChan;
     }
+    const auto fnSamples = [&](const T* p) {
+        return nChan == 1 ? LoadSamples(p) : Gather(p, anOffset);
+    };
     std::int64_t n = 0;
-    for (; n + kLanes <= nCount; n += kLanes, p += static_cast<std::int64_t>(nChan) * kLanes) {
-        const F64 sample = nChan == 1 ? LoadSamples(p) : Gather(p, anOffset);
-        const F64 sum = Load(padfSum + n);
-        Store(padfSum + n, kAdd ? sum + sample : sum - sample);
+    for (; n + kLanes <= nCount; n += kLanes) {
+        F64 sum = Load(padfSum + n);
+        sum = kAdd ? sum + fnSamples(pAdd + n * nChan) : sum;
+        sum = kSubtract ? sum - fnSamples(pSubtract + n * nChan) : sum;
+        Store(padfSum + n, sum);
     }
-    for (; n < nCount; ++n, p += nChan) {
-        const double df = static_cast<double>(*p);
-        padfSum[n] += kAdd ? df : -df;
+    for (; n < nCount; ++n) {
+        padfSum[n] += kAdd ? static_cast<double>(pAdd[n * nChan]) : 0.0;
+        padfSum[n] -= kSubtract ? static_cast<double>(pSubtract[n * nChan]) : 0.0;
+    }
+}
+
+// Adds a stretch of one channel of a source row to the sums of its columns, takes one away, or
+// both.
+template <typename T>
+VETRA_STAGE void AddRow(const void* pAdd, const void* pSubtract, int nChan, std::int64_t nCount,
+                        double* padfSum) {
+    const T* p = static_cast<const T*>(pAdd);
+    const T* q = static_cast<const T*>(pSubtract);
+    if (q == nullptr) {
+        ChangeSums<T, true, false>(p, q, nChan, nCount, padfSum);
+    } else if (p == nullptr) {
+        ChangeSums<T, false, true>(p, q, nChan, nCount, padfSum);
+    } else {
+        ChangeSums<T, true, true>(p, q, nChan, nCount, padfSum);
     }
 }
 
 // Sums from the left: padfTotal[n] is that of the first n columns.
-void AddUp(const double* padfSum, std::int64_t nCount, double* padfTotal) {
-    double dfTotal = 0.0;
-    std::int64_t n = 0;
+VETRA_STAGE void AddUp(const double* padfSum, std::int64_t nCount, double* padfTotal) {
     padfTotal[0] = 0.0;
-    // Four at a time, of which only one addition waits for the four before.
-    for (; n + 4 <= nCount; n += 4) {
-        const double df2 = padfSum[n] + padfSum[n + 1];
-        const double df3 = df2 + padfSum[n + 2];
-        const double df4 = df2 + (padfSum[n + 2] + padfSum[n + 3]);
-        padfTotal[n + 1] = dfTotal + padfSum[n];
-        padfTotal[n + 2] = dfTotal + df2;
-        padfTotal[n + 3] = dfTotal + df3;
-        dfTotal = dfTotal + df4;
-        padfTotal[n + 4] = dfTotal;
+    F64 total = Set1(0.0);
+    std::int64_t n = 0;
+    for (; n + kLanes <= nCount; n += kLanes) {
+        const F64 sums = RunningSums(Load(padfSum + n));
+        Store(padfTotal + n + 1, total + sums);
+        total = total + LastLane(sums);
     }
     for (; n < nCount; ++n) {
-        dfTotal += padfSum[n];
-        padfTotal[n + 1] = dfTotal;
+        padfTotal[n + 1] = padfTotal[n] + padfSum[n];
     }
 }
 
-// Means, where the one row of oRows holds the sums from the left.
-void SumValues(const RowWindows& oRows, double* padfValue) {
+// Means, where the one row of oRows holds the sums of columns.
+VETRA_STAGE void SumValues(const RowWindows& oRows, double* padfValue) {
     const WindowSize& oSize = *static_cast<const WindowSize*>(oRows.pParameters);
-    const F64 count = Set1(static_cast<double>(std::int64_t{oSize.nCols} * oSize.nRows));
+    const Divisor oCount = MakeDivisor(std::int64_t{oSize.nCols} * oSize.nRows);
+    const int nCols = oSize.nCols;
+    const double* padfSum = oRows.papdfRow[0];
+    ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
+        F64 sum = oWindow.Pick(padfSum, 0);
+        for (int j = 1; j < nCols; ++j) {
+            sum = sum + oWindow.Pick(padfSum, j);
+        }
+        Store(padfValue + i, DivideBy(sum, oCount));
+    });
+}
+
+// The same where it holds the sums from the left.
+VETRA_STAGE void TotalValues(const RowWindows& oRows, double* padfValue) {
+    const WindowSize& oSize = *static_cast<const WindowSize*>(oRows.pParameters);
+    const Divisor oCount = MakeDivisor(std::int64_t{oSize.nCols} * oSize.nRows);
     const double* padfTotal = oRows.papdfRow[0];
     ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
         const F64 sum = oWindow.Pick(padfTotal, oSize.nCols) - oWindow.Pick(padfTotal, 0);
-        Store(padfValue + i, sum / count);
+        Store(padfValue + i, DivideBy(sum, oCount));
     });
 }

@@ -29,6 +29,11 @@ struct Method {
     Scratch eScratch = Scratch::eNone;
 };
 
+/// The row of values for those windows of a replacing method that hold no masked pixel.
+inline ValuesRow PlainRow(const Method& oMethod) {
+    return oMethod.eValues == eVR_SQCUBICPS ? eVR_SQCUBIC : eVR_CUBIC;
+}
+
 /// Doubles of working memory that a thread needs.
 inline std::size_t GetScratchSize(const Method& oMethod) {
     const std::size_t nCols = static_cast<std::size_t>(oMethod.oWindow.nCols);
@@ -44,14 +49,36 @@ inline std::size_t GetScratchSize(const Method& oMethod) {
     return 0;
 }
 
+/// The ways through the sampling loop. All give the same result.
+enum class Path {
+    eBest,  ///< whichever of the others is best
+    /// Positions, modes and values pixel by pixel: for every transform.
+    ePlain,
+    // Those for axis-aligned transforms. Positions are tabulated per column.
+    eColumns,       ///< windows are read from the source
+    eRows,          ///< source rows become doubles (or roots) once
+    eFilteredRows,  ///< source rows are filtered along the columns once
+    eSums,          ///< sums over the rows of a window are kept running
+    eMedians,       ///< medians of neighbouring windows are found together
+};
+const char* GetPathName(Path ePath);
+
+struct PathChoice {
+    Path ePath = Path::ePlain;
+    const char* pszWhy = "";
+};
+
 /// What a run can be asked for beyond its result. The defaults are what every caller gets; tests
 /// ask for the rest.
 struct RunOptions {
     /// Takes what became of each target pixel; may be null.
     unsigned char* pabyOutcome = nullptr;
     Level eLevel = GetBestLevel();
-    /// Allow the shortcuts for axis-aligned transforms and plain copies.
-    bool bShortcuts = true;
+    /// ePlain turns off all shortcuts, those of masks, copies and channels too; eColumns only those
+    /// that keep rows. Other paths are taken by runs that they suit, and can't be forced on others.
+    Path ePath = Path::eBest;
+    /// Takes the path that the run took; may be null.
+    PathChoice* poTaken = nullptr;
 };
 
 /// One run of the sampling loop, with the sample types as codes.

@@ -50,7 +50,7 @@ void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
 }
 
 template <typename Method, typename T>
-void Values(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
+VETRA_STAGE void Values(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
     oSpan.nChan == 1 ? ValuesLoop<Method, T, true>(oSpan, p, padfValue)
                      : ValuesLoop<Method, T, false>(oSpan, p, padfValue);
@@ -58,7 +58,7 @@ void Values(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
 
 // A method that makes one complex value out of the samples of two channels.
 template <typename Method, typename T>
-void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
+VETRA_STAGE void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
     ForEachGroup<T, false>(oSpan, static_cast<const T*>(pSrc),
                            [&](int i, const WindowReader<T, false>& oWindow, F64 dx, F64 dy) {
                                F64 re;
@@ -69,9 +69,22 @@ void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double* padfValue)
                            });
 }
 
+// Bilinear values of all channels.
+template <int kNumChan, typename T>
+VETRA_STAGE void BilinearPixels(const WindowSpan& oSpan, const void* pSrc, double* padfValue) {
+    ForEachGroup<T, false>(oSpan, static_cast<const T*>(pSrc),
+                           [&](int i, const WindowReader<T, false>& oWindow, F64 dx, F64 dy) {
+                               F64 value[kNumChan];
+                               Bilinear::Values(oWindow, dx, dy, value);
+                               for (int c = 0; c < kNumChan; ++c) {
+                                   StoreValue(padfValue + c * kSpanArray + i, value[c]);
+                               }
+                           });
+}
+
 template <typename T, bool kNonNegative>
-void NearestValues(const void* pSrc, const std::int64_t* panOffset, const unsigned char* pabyMode,
-                   int nPix, double* padfValue) {
+VETRA_STAGE void NearestValues(const void* pSrc, const std::int64_t* panOffset,
+                               const unsigned char* pabyMode, int nPix, double* padfValue) {
     const T* p = static_cast<const T*>(pSrc);
     const auto fnNearest = [&](int i) {
         const F64 sample = Gather(p, panOffset + i);

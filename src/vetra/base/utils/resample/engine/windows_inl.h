@@ -97,6 +97,20 @@ struct WindowReader {
         }
     }
 
+    // The samples of the first two pixels of a row, of three or four channels.
+    template <int N>
+    void PixelPair(int nRow, F64 (&p)[N]) const {
+        static_assert(N == 6 || N == 8);
+        // The second four begin where they end with the pixel.
+        F64 first[4];
+        F64 second[4];
+        GatherQuad(At(nRow, 0), panOffset, first);
+        GatherQuad(At(nRow, 0) + (N - 4), panOffset, second);
+        for (int j = 0; j < N; ++j) {
+            p[j] = j < 4 ? first[j] : second[j - (N - 4)];
+        }
+    }
+
     F64 Sample(int nRow, int nCol) const { return Gather(At(nRow, nCol), panOffset); }
 
     // That sample and the one of the next channel.
@@ -139,16 +153,13 @@ struct WindowReader {
 
     bool HasMask() const { return oSpan.pabyMask != nullptr; }
 
-    template <int N>
-    void MaskRow(int nRow, F64 (&p)[N]) const {
+    // Of windows of four columns.
+    void MaskRow(int nRow, F64 (&p)[4]) const {
         std::int64_t anPixel[kLanes];
         for (int i = 0; i < kLanes; ++i) {
-            anPixel[i] = panOffset[i] / oSpan.nChan;
+            anPixel[i] = kSingleChannel ? panOffset[i] : panOffset[i] / oSpan.nChan;
         }
-        const unsigned char* pabyRow = oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan);
-        for (int j = 0; j < N; ++j) {
-            p[j] = Gather(pabyRow + j, anPixel);
-        }
+        GatherQuad(oSpan.pabyMask + nRow * (oSpan.nPitch / oSpan.nChan), anPixel, p);
     }
 };
 
@@ -203,22 +214,26 @@ struct RootReader {
         return oWindow.template RowInput<Filter>(dy);
     }
     bool HasMask() const { return oWindow.HasMask(); }
-    template <int N>
-    void MaskRow(int nRow, F64 (&p)[N]) const {
-        oWindow.MaskRow(nRow, p);
-    }
+    void MaskRow(int nRow, F64 (&p)[4]) const { oWindow.MaskRow(nRow, p); }
 };
 
-// Windows of rows that are doubles already (and roots, if need be). Columns lie close together
-// where kNear says so.
-template <bool kNear>
+// Windows of rows that are doubles already (and roots, if need be), which lie as a PickGroup says.
+template <PickGroup::Kind eKind>
 struct RowReader {
     const RowWindows& oRows;
     const PickGroup& oGroup;
 
     F64 Pick(const double* padfRow, int nCol) const {
-        const double* p = padfRow + oGroup.nFirst + nCol;
-        return kNear ? GatherNear(p, oGroup.anOffset) : Gather(p, oGroup.anOffset);
+        const double* p = padfRow + oGroup.nFirst;
+        if constexpr (eKind == PickGroup::eInARow) {
+            return Load(p + nCol);
+        } else if constexpr (eKind == PickGroup::eNear) {
+            // Four columns come from the same loads.
+            const int nShift = nCol % kNearColumns;
+            return GatherNear(p + (nCol - nShift), oGroup.anOffset, nShift);
+        } else {
+            return Gather(p + nCol, oGroup.anOffset);
+        }
     }
 
     template <int N>

@@ -1,0 +1,4 @@
+// The passes of the Fourier transforms for x86-64-v3 (AVX2).
+#define VETRA_LEVEL v3
+#define VETRA_LANES 8
+#include "vetra/base/utils/math/fourier/passes_inl.h"

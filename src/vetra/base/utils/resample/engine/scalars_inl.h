@@ -1,0 +1,54 @@
+// What lane layers have in common that isn't done in lanes. Included inside a level's namespace;
+// see stages_inl.h.
+
+// An integer divisor and its reciprocal in two parts, by which some lane layers divide.
+struct Divisor {
+    double dfValue;
+    double dfHigh;  // 1 / dfValue, rounded down to a double
+    double dfLow;   // what is missing
+};
+
+// Of a whole number from 1 to 2^45.
+constexpr Divisor MakeDivisor(std::int64_t nValue) {
+    // Long division, bit by bit, until the quotient has all the bits of a double.
+    std::int64_t nQuotient = 0;
+    std::int64_t nRest = 1;
+    double dfUnit = 1.0;
+    while (nQuotient < std::int64_t{1} << 52) {
+        const bool bOne = nRest >= nValue;
+        nRest = 2 * (bOne ? nRest - nValue : nRest);
+        nQuotient = 2 * nQuotient + (bOne ? 1 : 0);
+        dfUnit *= 0.5;
+    }
+    // One digit stood before the point.
+    dfUnit *= 2.0;
+    const double dfValue = static_cast<double>(nValue);
+    const double dfHigh = static_cast<double>(nQuotient) * dfUnit;
+    // Never 0, by which an infinite number can't be multiplied.
+    const double dfLow =
+        nRest == 0 ? dfHigh * 0x1p-100 : static_cast<double>(nRest) * 0.5 / dfValue * dfUnit;
+    return {dfValue, dfHigh, dfLow};
+}
+
+// Whether a number in x is below 2^-511 in size, but not 0.
+template <typename Number, int N>
+inline bool AnySmallNumber(const Number (&x)[N]) {
+    constexpr int kCount = N * kLanes;
+    double adf[kCount];
+    __builtin_memcpy(adf, x, sizeof adf);
+    int nSmall = 0;
+    for (int i = 0; i < kCount; ++i) {
+        nSmall += __builtin_fabs(adf[i]) < 0x1p-511 && adf[i] != 0.0 ? 1 : 0;
+    }
+    return nSmall != 0;
+}
+
+// Bits of eight numbers, set where a map has a bit at that number.
+inline unsigned PickBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
+    std::uint64_t nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        const std::int64_t n = panPlace[i];
+        nBits |= (panMap[n >> 6] >> (n & 63) & 1u) << i;
+    }
+    return static_cast<unsigned>(nBits);
+}
