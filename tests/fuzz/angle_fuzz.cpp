@@ -44,7 +44,8 @@ void Write(double dfValue) {
         double dfRead = 0.0;
         const int nKind = DMSToDec(pszText.get(), &dfRead);
         if (nForm < 7 || nForm > 9) {
-            Require(nKind == (bLatitude ? (nDegrees <= 90 ? nKind : 0) : 2));
+            // Far below -270 a latitude is folded to more than 90.
+            Require(bLatitude ? nDegrees == 90 || nKind == (nDegrees < 90 ? 1 : 0) : nKind == 2);
             Require(std::abs(std::abs(dfRead) - nDegrees) < 1.001);
             Require(std::signbit(dfRead) ==
                     (nKind != 0 && (chHemisphere == 'S' || chHemisphere == 'W')));

@@ -21,7 +21,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* pabyData, std::size_t 
         int nRight = 0;
         int nBottom = 0;
         poResampler->GetSrcBufferMargins(nLeft, nTop, nRight, nBottom);
-        if (nLeft < 0 || nTop < 0 || nRight < 0 || nBottom < 0) {
+        if (nLeft > 0 || nTop > 0 || nRight < 0 || nBottom < 0) {
             std::abort();
         }
     } catch (const vetra::Exception&) {

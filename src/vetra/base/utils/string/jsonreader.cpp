@@ -14,10 +14,10 @@
 // Scanning anew at each level would be quadratic, so scans keep what they find out:
 //
 //   - A bracket that a scan pushed closes where that scan popped it: from there up the stack, a
-//   scan
-//     that begins with this bracket does the same. A scan pushes all brackets that it meets (but
-//     protected ones, where none begins), so it is asked for each part of the text once, or finds
-//     the answer there. A later scan also passes over such a bracket and all within it at once.
+//     scan that begins with this bracket does the same. A scan pushes all brackets that it meets
+//     (but protected ones, where none begins), so it is asked for each part of the text once, or
+//     finds the answer there. A later scan also passes over such a bracket and all within it at
+//     once.
 //   - A scan that begins with a quote mostly covers a string, which is not read any deeper. But an
 //     unquoted key lets a map begin within such a stretch, and scans that begin with different
 //     quotes could then pass over the same text again and again. Two of them go the same way from
