@@ -61,7 +61,7 @@ TEST(DecimalToDegrees, Fields) {
         {59.9996 / 3600.0, "Lat", 0, "0 1 0 0 N"},
         {1.5 / 3600.0, "Lat", 9, "0 0 1 500000000 N"},
         {-0.0, "Long", 0, "0 0 0 0 E"},
-        {0x1p53, "Long", 0, "88 0 0 0 W"},
+        {0x1p53, "Long", 0, "32 0 0 0 E"},
     };
     for (const auto& [dfValue, pszFormat, nDecimals, pszFields] : aoCases) {
         EXPECT_EQ(Fields(dfValue, pszFormat, nDecimals), pszFields) << dfValue;
@@ -105,7 +105,7 @@ TEST(DecToDMS, Forms) {
         {-0.5, 9, "   0:30:00.0000"},        {-180.0, 9, "-180:00:00.0000"},
         {5.5, 10, "  5d30'00.000000\"N"},    {-100.0, 11, "100d00'00.000000\"W"},
         {100.0, 1, " 80d00'00\" N    "},     {190.0, 4, "170d00'00\" W    "},
-        {0x1p53, 11, " 88d00'00.000000\"W"},
+        {0x1p53, 11, " 32d00'00.000000\"E"},
     };
     for (const auto& [dfValue, nForm, pszText] : aoCases) {
         EXPECT_EQ(Text(dfValue, nForm), pszText) << nForm;
