@@ -1,6 +1,7 @@
 #include "vetra/base/utils/string/jsonparser.h"
 
 #include <gtest/gtest.h>
+#include <malloc.h>
 #include <sys/resource.h>
 #include <sys/wait.h>
 #include <unistd.h>
@@ -168,13 +169,13 @@ TEST(Json, TimeIsLinear) {
     // Whatever is repeated, closed or not.
     const char* const apszPieces[] = {"{", "}", "[", "]", "\"", ":", ",", "\\", " ", "x", "\"a\":"};
     std::mt19937 oRandom(2);
-    for (int nUnit = 0; nUnit < 150; ++nUnit) {
+    for (int nUnit = 0; nUnit < 100; ++nUnit) {
         std::string sUnit;
         for (unsigned n = 1 + oRandom() % 7; n > 0; --n) {
             sUnit += apszPieces[oRandom() % std::size(apszPieces)];
         }
         const std::string sText = (nUnit % 2 == 0 ? R"({"a":[)" : "{") +
-                                  Repeat(sUnit, 300'000 / sUnit.size()) +
+                                  Repeat(sUnit, 200'000 / sUnit.size()) +
                                   (nUnit % 3 == 0 ? "}" : "]}");
         EXPECT_LT(Seconds([&] {
                       Outcome([&] {
@@ -182,7 +183,7 @@ TEST(Json, TimeIsLinear) {
                           return std::string();
                       });
                   }),
-                  kManySeconds)
+                  2.0)
             << sUnit;
     }
 }
@@ -214,12 +215,13 @@ TEST(Json, DeepNesting) {
                   EXPECT_EQ(DepthOf(oCopy.GetRoot()), kDepth);
                   const JsonParser oMaps(Repeat(R"({"a":)", kDepth) + '1' + Repeat("}", kDepth));
                   EXPECT_EQ(DepthOf(oMaps.GetRoot()), kDepth);
+                  const JsonParser oOneCloser(Repeat(R"({"a":)", kDepth) + '}');
+                  EXPECT_EQ(DepthOf(oOneCloser.GetRoot()), kDepth);
               }),
               kManySeconds);
     for (const std::string& sText :
          {kOpenLists, kOpenLists + '}', kOpenLists + std::string(kDepth / 2, ']') + '}',
-          Repeat(R"({"a":)", kDepth), Repeat(R"({"a":)", kDepth) + '}',
-          Repeat(R"({"a":[")", kDepth) + '}'}) {
+          Repeat(R"({"a":)", kDepth), Repeat(R"({"a":[")", kDepth) + '}'}) {
         std::string sOutcome;
         EXPECT_LT(Seconds([&] { sOutcome = Outcome([&] { return JsonParser(sText), ""; }); }),
                   kManySeconds);
@@ -231,6 +233,7 @@ TEST(Json, DeepNesting) {
 double MemoryPerByte(const std::string& sText) {
     int anPipe[2];
     EXPECT_EQ(pipe(anPipe), 0);
+    malloc_trim(0);
     const pid_t nChild = fork();
     if (nChild == 0) {
         const auto fnPeak = [] {
@@ -258,7 +261,7 @@ TEST(Json, MemoryIsLinear) {
 #endif
 #endif
     for (const std::string& sText :
-         {kOpenLists + std::string(kDepth, ']') + '}', kOpenLists, kOpenLists + '}',
+         {kOpenLists + std::string(kDepth, ']') + '}', kOpenLists + '}',
           Repeat(R"({"a":)", kDepth) + Repeat("}", kDepth), "{" + Repeat(R"("a":1)", kDepth) + '}',
           R"({"a":[)" + Repeat("1,", kDepth) + "]}"}) {
         const double dfMemory = MemoryPerByte(sText);
