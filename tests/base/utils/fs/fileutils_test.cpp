@@ -5,17 +5,16 @@
 #include <limits.h>
 #include <sys/resource.h>
 #include <sys/stat.h>
-#include <sys/wait.h>
 #include <unistd.h>
 
 #include <algorithm>
 #include <cstdlib>
 #include <filesystem>
-#include <functional>
 #include <random>
 #include <string>
 #include <vector>
 
+#include "tests/support/ordinaryuser.h"
 #include "tests/support/scratchfolder.h"
 #include "vetra/faultcore/exceptions.h"
 
@@ -24,20 +23,8 @@ namespace {
 
 namespace fs = std::filesystem;
 using Paths = std::vector<std::string>;
+using tests::AsOrdinaryUser;
 using tests::ScratchFolder;
-
-// Permissions don't bind the superuser: asks in a process of an ordinary one.
-bool AsOrdinaryUser(const std::function<bool()>& fnAsk) {
-    const pid_t nChild = fork();
-    if (nChild == 0) {
-        const bool bReady = geteuid() != 0 || (setresgid(65534, 65534, 65534) == 0 &&
-                                               setresuid(65534, 65534, 65534) == 0);
-        _exit(bReady && fnAsk() ? 0 : 1);
-    }
-    int nStatus = 0;
-    return waitpid(nChild, &nStatus, 0) == nChild && WIFEXITED(nStatus) &&
-           WEXITSTATUS(nStatus) == 0;
-}
 
 bool IsRefusedToDelete(const std::string& sPath) {
     try {

@@ -10,25 +10,16 @@
 #include <string_view>
 
 #include "vetra/base/utils/string/streammatcher.h"
+#include "vetra/base/utils/string/whitespace.h"
 
 namespace {
 
-// The C library's classes follow the process's locale; these are fixed.
-constexpr std::string_view kWhitespace = " \t\n\v\f\r";
+using vetra::IsSpace;
+using vetra::Trim;
 
 bool IsDigit(char c) { return c >= '0' && c <= '9'; }
 
-bool IsSpace(char c) { return kWhitespace.find(c) != std::string_view::npos; }
-
 bool AllDigits(std::string_view s) { return std::all_of(s.begin(), s.end(), IsDigit); }
-
-std::string_view Trim(std::string_view s) {
-    const std::size_t nFirst = s.find_first_not_of(kWhitespace);
-    if (nFirst == std::string_view::npos) {
-        return {};
-    }
-    return s.substr(nFirst, s.find_last_not_of(kWhitespace) - nFirst + 1);
-}
 
 class ByteSet {
  public:
