@@ -37,47 +37,93 @@ struct Interval {
 struct Strip {
     int nFirstCol = -1;
     int nCols = 0;
-    int nUnknown = 0;
+    int nGridCols = 0;
+    int nStep = 1;
     float af[kStripCols];
-    int anLeft[kStripCols];
-    int anRight[kStripCols];
-    int anUnknown[kStripCols];
     float aafRows[2][kStripCols];
     float* pafUpper = aafRows[0];
     float* pafLower = aafRows[1];
 
-    void SetColumns(int nFirst, int nGridCols, int nStep) {
+    void SetColumns(int nFirst, int nAllCols, int nColStep) {
         nFirstCol = nFirst;
+        nGridCols = nAllCols;
+        nStep = nColStep;
         nCols = std::min(kStripCols, nGridCols - nFirst);
-        nUnknown = 0;
         for (int i = 0; i < nCols; ++i) {
-            const Interval oInterval(nFirst + i, nGridCols, nStep);
-            af[i] = oInterval.f;
-            anLeft[i] = oInterval.n0;
-            anRight[i] = oInterval.n1;
-            if (!oInterval.IsKnown(nFirst + i)) {
-                anUnknown[nUnknown++] = i;
+            af[i] = Interval(nFirst + i, nGridCols, nStep).f;
+        }
+    }
+
+    // Calls fn(c0, c1, nBegin, nEnd) for the known columns around each segment of the strip from
+    // index nFrom, and the indices in the strip from the one of c0 to before the one of the next.
+    template <typename Function>
+    void ForSegments(int nFrom, Function fn) const {
+        int64_t c0 = (nFirstCol + nFrom) / nStep * int64_t{nStep};
+        for (; c0 < int64_t{nFirstCol} + nCols; c0 += nStep) {
+            fn(c0, std::min<int64_t>(nGridCols - 1, c0 + nStep),
+               static_cast<int>(std::max<int64_t>(0, c0 - nFirstCol)),
+               static_cast<int>(std::min<int64_t>(nCols, c0 + nStep - nFirstCol)));
+        }
+    }
+
+    // Segments of a small constant length, as many as are whole: their number of columns.
+    template <int kStep>
+    int InterpolateWhole(const float* pafRow, float* pafOut) const {
+        static_assert(kStripCols % kStep == 0);
+        const int nSegments = std::min(nCols, nGridCols - 1 - nFirstCol) / kStep;
+        const float* pafKnown = pafRow + nFirstCol;
+        for (int k = 0; k < kStep && nSegments > 0; ++k) {
+            const float f = af[k];
+#pragma omp simd
+            for (int j = 0; j < nSegments; ++j) {
+                pafOut[j * kStep + k] =
+                    (1.0f - f) * pafKnown[j * kStep] + f * pafKnown[(j + 1) * kStep];
             }
         }
+        return nSegments * kStep;
     }
 
     void Interpolate(const float* pafRow, float* pafOut) const {
-        for (int i = 0; i < nCols; ++i) {
-            pafOut[i] = (1.0f - af[i]) * pafRow[anLeft[i]] + af[i] * pafRow[anRight[i]];
-        }
+        const int nDone = nStep == 1   ? InterpolateWhole<1>(pafRow, pafOut)
+                          : nStep == 2 ? InterpolateWhole<2>(pafRow, pafOut)
+                          : nStep == 4 ? InterpolateWhole<4>(pafRow, pafOut)
+                                       : 0;
+        ForSegments(nDone, [=, this](int64_t c0, int64_t c1, int nBegin, int nEnd) {
+            const float fLeft = pafRow[c0];
+            const float fRight = pafRow[c1];
+#pragma omp simd
+            for (int i = nBegin; i < nEnd; ++i) {
+                pafOut[i] = (1.0f - af[i]) * fLeft + af[i] * fRight;
+            }
+        });
     }
 
-    void Blend(float fy, float* pafRow) const {
-        for (int i = 0; i < nCols; ++i) {
-            pafRow[i] = (1.0f - fy) * pafUpper[i] + fy * pafLower[i];
+    void Blend(float fy, float* pafRow) const { Blend(fy, pafRow, 0, nCols); }
+
+    void Blend(float fy, float* pafRow, int nBegin, int nEnd) const {
+        const float* pafAbove = pafUpper;
+        const float* pafBelow = pafLower;
+#pragma omp simd
+        for (int i = nBegin; i < nEnd; ++i) {
+            pafRow[i] = (1.0f - fy) * pafAbove[i] + fy * pafBelow[i];
         }
     }
 
     // Other threads may be reading the known samples of a known row.
     void BlendUnknown(float fy, float* pafRow) const {
-        for (int nAt = 0; nAt < nUnknown; ++nAt) {
-            const int i = anUnknown[nAt];
-            pafRow[i] = (1.0f - fy) * pafUpper[i] + fy * pafLower[i];
+        if (nStep == 2) {
+            const int nEnd = std::min(nCols, nGridCols - 1 - nFirstCol);
+            const float* pafAbove = pafUpper;
+            const float* pafBelow = pafLower;
+            for (int i = 1; i < nEnd; i += 2) {
+                pafRow[i] = (1.0f - fy) * pafAbove[i] + fy * pafBelow[i];
+            }
+        } else if (nStep > 2) {
+            ForSegments(0, [=, this](int64_t c0, int64_t c1, int nBegin, int nEnd) {
+                const int nKnown = nFirstCol + nBegin == c0 ? 1 : 0;
+                Blend(fy, pafRow, nBegin + nKnown,
+                      static_cast<int>(std::min<int64_t>(nEnd, c1 - nFirstCol)));
+            });
         }
     }
 };
