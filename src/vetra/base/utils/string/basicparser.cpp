@@ -14,6 +14,8 @@
 namespace {
 
 constexpr const char* kCannotOpen = "Error when trying to open this file";
+// Counts as blanks.
+constexpr std::string_view kPunctuation = "=;:,\n";
 
 [[noreturn]] void Refuse(const std::string& sFile, const char* pszMessage) {
     throw vetra::FileAccessException(sFile, vetra::FileAccessException::eCannotRead, pszMessage,
@@ -88,7 +90,6 @@ BasicParser& BasicParser::operator=(const BasicParser& oOther) = default;
 BasicParser::~BasicParser() = default;
 
 void BasicParser::BeginSorting() {
-    constexpr std::string_view kPunctuation = "=;:,\n";
     std::replace_if(
         msContents.begin(), msContents.end(),
         [](char c) { return kPunctuation.find(c) != std::string_view::npos; }, ' ');
