@@ -209,7 +209,7 @@ TEST(Conversions, SpecialPoints) {
                    {{0.0, 0.0, -b}, {0.0, -kPi / 2, 0.0}},
                    {{1e-170, 1e-170, -b}, {kPi / 4, -kPi / 2, 0.0}},
                    {{kA, 0.0, 0.0}, {0.0, 0.0, 0.0}},
-                   {{kA, -0.0, 0.0}, {0.0, 0.0, 0.0}},
+                   {{kA, -0.0, -0.0}, {0.0, 0.0, 0.0}},
                    {{-kA, 0.0, 0.0}, {kPi, 0.0, 0.0}},
                    {{-kA, -0.0, 0.0}, {kPi, 0.0, 0.0}},
                    {{-kA, -1e-300, 0.0}, {kPi, 0.0, 0.0}},
@@ -226,6 +226,7 @@ TEST(Conversions, SpecialPoints) {
                 continue;  // only the closed form has a limit there
             }
             EXPECT_DOUBLE_EQ(g.y, oExpected.y);
+            EXPECT_TRUE(g.y != 0.0 || !std::signbit(g.y) || oInverse.sName == "function");
             EXPECT_DOUBLE_EQ(g.z, oExpected.z);
         }
     }

@@ -157,7 +157,7 @@ TEST(GetAzimuth, AllDirections) {
     EXPECT_EQ(GetAzimuth(0.0, 0.0, 0.0, -1.0), 180.0);
     EXPECT_EQ(GetAzimuth(0.0, 0.0, -0.0, -1.0), 180.0);
     EXPECT_EQ(GetAzimuth(3.0, 4.0, 3.0, 4.0), 0.0);
-    // Just west of south, where the angle or its degrees round to -180.
+    // Just west of south, where the angle rounds to -180 degrees.
     for (const double dfEast : {-1e-300, -1e-20, -1e-16, -4e-16}) {
         const double dfAzimuth = GetAzimuth(0.0, 0.0, dfEast, -1.0);
         EXPECT_TRUE(dfAzimuth > -180.0 && std::abs(std::abs(dfAzimuth) - 180.0) < 1e-13) << dfEast;

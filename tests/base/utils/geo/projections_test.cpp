@@ -124,6 +124,16 @@ TEST(Projections, MissesWriteNothing) {
             EXPECT_LE(std::abs(df), 2000.0);
         }
     }
+    // The centre isn't quite below: rays that fall below the horizon, to both sides of a right
+    // angle with the direction from the centre.
+    double O[3];
+    EllipCalc().GeoToXYZ(0.0, 0.8, 1.0, O[0], O[1], O[2]);
+    for (const double dfUp : {1e-3, -1e-3}) {
+        const double dfTurn = std::atan2(O[2], O[0]) + dfUp;
+        const double D[3] = {std::sin(dfTurn), 0.0, -std::cos(dfTurn)};
+        double p[3];
+        EXPECT_EQ(ProjectToEllipsoid(O, D, kA, kE2, 0.0, p), dfUp > 0.0 ? -1 : 0);
+    }
     for (const double dfOdd : {0.0, kNaN}) {
         const double V[3] = {0.0, dfOdd, 0.0};
         double p[3] = {7.0, 7.0, 7.0};

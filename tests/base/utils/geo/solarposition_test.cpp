@@ -157,6 +157,37 @@ TEST(SolarPosition, Quadrants) {
     }
 }
 
+// Where a sine comes out at 1, or beyond it by rounding, and north at 360: halving intervals of
+// time ends there.
+TEST(SolarPosition, ExactDirections) {
+    for (int nDay = 0; nDay < 12 * 28; ++nDay) {
+        const auto fnAt = [&](float fLat, double dfSecond) {
+            float z = -1.0f, a = -1.0f;
+            SolarZenithAzimuth(2003, 1 + nDay / 28, 1 + nDay % 28, 12, 0, dfSecond, fLat, 0.0f, z,
+                               a);
+            EXPECT_TRUE(z >= 0.0f && z <= 180.0f && a > 0.0f && a <= 360.0f) << z << ' ' << a;
+            return std::pair(z, a);
+        };
+        const auto fnWhen = [&](float fLat, double dfFrom, double dfTo, float fLimit) {
+            for (int i = 0; i < 60; ++i) {
+                const double dfMiddle = (dfFrom + dfTo) / 2.0;
+                (fnAt(fLat, dfMiddle).second < fLimit ? dfFrom : dfTo) = dfMiddle;
+            }
+            return dfTo;
+        };
+        const double dfNoon = fnWhen(-60.0f, -3600.0, 3600.0, 180.0f);
+        EXPECT_EQ(fnAt(-60.0f, dfNoon).second, 360.0f);
+        EXPECT_EQ(fnAt(60.0f, dfNoon).second, 180.0f);
+        float fOverhead = 60.0f - fnAt(60.0f, dfNoon).first;
+        for (int i = 0; i < 8; ++i) {
+            fOverhead = std::nextafter(fOverhead, i < 3 ? -90.0f : 90.0f);
+            EXPECT_LT(fnAt(fOverhead, dfNoon).first, 1e-3f);
+        }
+        const double dfEast = fnWhen(60.0f, -43200.0, dfNoon, 90.0f);
+        EXPECT_NEAR(fnAt(60.0f, dfEast).second, 90.0, 1e-4) << nDay;
+    }
+}
+
 TEST(SolarPosition, OddInputs) {
     // Poles, the sun overhead or nearly so, and where the horizon cuts: an angle in any case.
     for (const float fLat : {-90.0f, -23.0f, 0.0f, 23.434f, 90.0f}) {

@@ -155,10 +155,10 @@ void EllipCalc::LatHgt(double p2, double Z, bool bPoleForm, double& dfLat, doubl
     dfHgt = (p + Z * t - std::sqrt(semiMajorSq + semiMinorSq * (t * t))) / std::sqrt(1.0 + t * t);
 }
 
-// The quartic f(t) = p2 t^4 + k1 t^3 + k2 t^2 + k3 t + k4, with k1 = -2 p Z, k2 = (p2 - e^4 a^2) /
-// c
-// + Z^2, k3 = k1 / c, k4 = Z^2 / c and c = 1 - e^2, in the form w^2 (t^2 + 1 / c) - e^4 a^2 / c t^2
-// with w = p t - Z, which doesn't subtract nearly equal products of large numbers.
+// The quartic f(t) = p2 t^4 + k1 t^3 + k2 t^2 + k3 t + k4 has, with c = 1 - e^2, the coefficients
+// k1 = -2 p Z, k2 = (p2 - e^4 a^2) / c + Z^2, k3 = k1 / c and k4 = Z^2 / c. It is evaluated as
+// w^2 (t^2 + 1 / c) - e^4 a^2 / c t^2 with w = p t - Z, which doesn't subtract nearly equal
+// products of large numbers.
 double EllipCalc::NewtonTanLat(double p, double Z) const {
     const double dfInvC = 1.0 / oneMinusEccSq;
     const double g = eccFourth * semiMajorSq * dfInvC;

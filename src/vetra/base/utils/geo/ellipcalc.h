@@ -37,9 +37,8 @@ class VETRA_EXPORT EllipCalc {
     /// the next `SetLsrOrigin`.
     ///
     /// \param dfSemiMajor  semi-major axis in metres, above 0
-    /// \param dfEccSq      first eccentricity squared, at least 0; 0 is a sphere. From 1 on, which
-    /// is
-    ///                     not checked, it isn't an ellipsoid, and results are NaN.
+    /// \param dfEccSq      first eccentricity squared, at least 0; 0 is a sphere. 1 and more, which
+    ///                     isn't checked, is no ellipsoid, and results are without meaning.
     /// \throws ParameterException for other values; nothing changes then
     void SetEllipsoid(double dfSemiMajor, double dfEccSq);
 

@@ -92,9 +92,7 @@ void LSRToXYZ(const double* padfLocal, double dfLon, double dfLat, double* padfX
 }
 
 double GetAzimuth(double x1, double y1, double x2, double y2) {
-    const double dfAzimuth = PolarAngle(y2 - y1, x2 - x1) * kDegPerRad;
-    // An angle just above -pi can round to -180 degrees.
-    return dfAzimuth == -180.0 ? 180.0 : dfAzimuth;
+    return PolarAngle(y2 - y1, x2 - x1) * kDegPerRad;
 }
 
 int ProjectOriginToEllipsoid(const double* padfVector, double a, double e2, double h,
