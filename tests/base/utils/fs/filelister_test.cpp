@@ -4,7 +4,7 @@
 #include <sys/stat.h>
 
 #include <algorithm>
-#include <chrono>
+#include <ctime>
 #include <filesystem>
 #include <fstream>
 #include <random>
@@ -186,14 +186,15 @@ TEST(FileLister, ManyPairsInTimeLinearInTheirNumber) {
         std::ofstream(sName + ".hdr");
         std::ofstream(sName + ".img");
     }
-    const auto begin = std::chrono::steady_clock::now();
+    const std::clock_t nBegin = std::clock();
     const Pairs voPairs = Search(oScratch.GetPath());
-    const std::chrono::duration<double> oTime = std::chrono::steady_clock::now() - begin;
+    const double dfSeconds = static_cast<double>(std::clock() - nBegin) / CLOCKS_PER_SEC;
     EXPECT_EQ(voPairs.size(), 100'000u);
     EXPECT_TRUE(std::all_of(voPairs.begin(), voPairs.end(), [](const auto& o) {
         return fs::path(o.first).replace_extension(".img") == o.second;
     }));
-    EXPECT_LT(oTime.count(), 2.0);
+    // Far above what a slow machine needs, far below what anything quadratic does.
+    EXPECT_LT(dfSeconds, 10.0);
 }
 
 }  // namespace
