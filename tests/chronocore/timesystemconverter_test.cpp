@@ -42,7 +42,7 @@ TEST(TimeSystemConverter, JulianDates) {
         EXPECT_EQ(
             Julian(int(oDate.year()), int(unsigned(oDate.month())), int(unsigned(oDate.day())))
                 .dfDays,
-            day.time_since_epoch().count() + 2440587.5);
+            static_cast<double>(day.time_since_epoch().count()) + 2440587.5);
     }
 }
 

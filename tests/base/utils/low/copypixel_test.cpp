@@ -62,9 +62,8 @@ template <typename Function>
 void ExpectWritten(const Bytes& vbyExpected, Function fnWrite) {
     Bytes vbyBuffer(vbyExpected.size() + 18, 0xee);
     fnWrite(vbyBuffer.data() + 9);
-    Bytes vbyAll(9, 0xee);
-    vbyAll.insert(vbyAll.end(), vbyExpected.begin(), vbyExpected.end());
-    vbyAll.resize(vbyBuffer.size(), 0xee);
+    Bytes vbyAll(vbyBuffer.size(), 0xee);
+    std::copy(vbyExpected.begin(), vbyExpected.end(), vbyAll.begin() + 9);
     EXPECT_EQ(vbyBuffer, vbyAll);
 }
 
@@ -72,8 +71,8 @@ void ExpectWritten(const Bytes& vbyExpected, Function fnWrite) {
 void CheckFunctions(const Bytes& vbyIn, const Bytes& vbyExpected, NativeDataTypeCode eOut,
                     NativeDataTypeCode eIn, unsigned int nCount) {
     SCOPED_TRACE(DataTypeAdapter::TypeToString(eIn) + " to " + DataTypeAdapter::TypeToString(eOut));
-    Bytes vbyOdd(1, 0);
-    vbyOdd.insert(vbyOdd.end(), vbyIn.begin(), vbyIn.end());
+    Bytes vbyOdd(vbyIn.size() + 1);
+    std::copy(vbyIn.begin(), vbyIn.end(), vbyOdd.begin() + 1);
     const unsigned char* pabyIn = vbyOdd.data() + 1;
     ExpectWritten(vbyExpected, [&](unsigned char* p) { CopyPixel(p, pabyIn, eOut, eIn, nCount); });
     ExpectWritten(vbyExpected, [&](unsigned char* p) {

@@ -34,8 +34,11 @@ double CpuTime() {
 // Spends CPU time outside the kernel.
 void Burn(double dfMilliseconds) {
     for (const double dfStart = CpuTime(); CpuTime() < dfStart + dfMilliseconds;) {
-        for (volatile int n = 0; n < 100'000; n = n + 1) {
+        volatile int nSink = 0;
+        for (int n = 0; n < 100'000; ++n) {
+            nSink = n;
         }
+        static_cast<void>(nSink);
     }
 }
 
