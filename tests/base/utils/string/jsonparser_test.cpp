@@ -171,7 +171,7 @@ TEST(Json, TimeIsLinear) {
     std::mt19937 oRandom(2);
     for (int nUnit = 0; nUnit < 100; ++nUnit) {
         std::string sUnit;
-        for (unsigned n = 1 + oRandom() % 7; n > 0; --n) {
+        for (auto n = 1 + oRandom() % 7; n > 0; --n) {
             sUnit += apszPieces[oRandom() % std::size(apszPieces)];
         }
         const std::string sText = (nUnit % 2 == 0 ? R"({"a":[)" : "{") +
