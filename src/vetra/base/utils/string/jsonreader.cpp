@@ -1,6 +1,8 @@
 #include "vetra/base/utils/string/jsonreader.h"
 
 #include <algorithm>
+#include <cstdlib>
+#include <new>
 #include <stdexcept>
 #include <utility>
 
@@ -170,14 +172,20 @@ std::size_t JsonReader::EndOfEntry(std::size_t nStart, const Open& oOpen) {
 // The place behind the closer of the bracket or quote at nStart; nEnd when it isn't closed. In a
 // map a backslash protects the next character.
 std::size_t JsonReader::ScanBrackets(std::size_t nStart, std::size_t nEnd, bool bInMap) {
-    std::vector<std::size_t>& vnEnds = mavnEnds[bInMap];
+    auto& pnEnds = mapnEnds[bInMap];
     const auto fnKnown = [&](std::size_t n) {
-        return vnEnds.empty() || msText[n] == '"' ? 0 : vnEnds[n];
+        return pnEnds == nullptr || msText[n] == '"' ? 0 : pnEnds[n];
     };
     const auto fnKeep = [&](std::size_t n, std::size_t nKnown) {
         if (msText[n] != '"') {
-            vnEnds.resize(msText.size());
-            vnEnds[n] = nKnown;
+            if (pnEnds == nullptr) {
+                pnEnds.reset(
+                    static_cast<std::size_t*>(std::calloc(msText.size(), sizeof(std::size_t))));
+                if (pnEnds == nullptr) {
+                    throw std::bad_alloc();
+                }
+            }
+            pnEnds[n] = nKnown;
         }
     };
     if (fnKnown(nStart) != 0) {

@@ -2,6 +2,7 @@
 #define VETRA_BASE_UTILS_STRING_JSONREADER_H
 
 #include <cstddef>
+#include <cstdlib>
 #include <memory>
 #include <stack>
 #include <string_view>
@@ -42,6 +43,10 @@ class JsonReader {
         std::size_t mnFound = 0;  // nothing was looked for: an empty range
     };
 
+    struct Release {
+        void operator()(std::size_t* p) const { std::free(p); }
+    };
+
     /// A container whose entries from nNext to nEnd are still to be read.
     struct Open {
         JsonNode* poNode;
@@ -71,7 +76,8 @@ class JsonReader {
     // What the scans learned, one array for lists and one for maps: at an opening bracket the place
     // behind its closer, at a closing bracket that of the end of a quote that is alone on the stack
     // there. 0 where nothing is known, npos where the end of the text came first.
-    std::vector<std::size_t> mavnEnds[2];
+    // From calloc: of most texts only a few pages are touched.
+    std::unique_ptr<std::size_t[], Release> mapnEnds[2];
     // Working memory of the scans.
     std::vector<std::size_t> mvnStack;
     std::vector<std::size_t> mvnPassed;
