@@ -68,13 +68,12 @@ struct Strip {
 
     // Segments of a small constant length, as many as are whole: their number of columns.
     template <int kStep>
-    int InterpolateWhole(const float* pafRow, float* pafOut) const {
+    int InterpolateWhole(const float* pafRow, float* __restrict pafOut) const {
         static_assert(kStripCols % kStep == 0);
         const int nSegments = std::min(nCols, nGridCols - 1 - nFirstCol) / kStep;
         const float* pafKnown = pafRow + nFirstCol;
         for (int k = 0; k < kStep && nSegments > 0; ++k) {
             const float f = af[k];
-#pragma omp simd
             for (int j = 0; j < nSegments; ++j) {
                 pafOut[j * kStep + k] =
                     (1.0f - f) * pafKnown[j * kStep] + f * pafKnown[(j + 1) * kStep];
@@ -83,7 +82,7 @@ struct Strip {
         return nSegments * kStep;
     }
 
-    void Interpolate(const float* pafRow, float* pafOut) const {
+    void Interpolate(const float* pafRow, float* __restrict pafOut) const {
         const int nDone = nStep == 1   ? InterpolateWhole<1>(pafRow, pafOut)
                           : nStep == 2 ? InterpolateWhole<2>(pafRow, pafOut)
                           : nStep == 4 ? InterpolateWhole<4>(pafRow, pafOut)
@@ -91,7 +90,6 @@ struct Strip {
         ForSegments(nDone, [=, this](int64_t c0, int64_t c1, int nBegin, int nEnd) {
             const float fLeft = pafRow[c0];
             const float fRight = pafRow[c1];
-#pragma omp simd
             for (int i = nBegin; i < nEnd; ++i) {
                 pafOut[i] = (1.0f - af[i]) * fLeft + af[i] * fRight;
             }
@@ -100,10 +98,9 @@ struct Strip {
 
     void Blend(float fy, float* pafRow) const { Blend(fy, pafRow, 0, nCols); }
 
-    void Blend(float fy, float* pafRow, int nBegin, int nEnd) const {
+    void Blend(float fy, float* __restrict pafRow, int nBegin, int nEnd) const {
         const float* pafAbove = pafUpper;
         const float* pafBelow = pafLower;
-#pragma omp simd
         for (int i = nBegin; i < nEnd; ++i) {
             pafRow[i] = (1.0f - fy) * pafAbove[i] + fy * pafBelow[i];
         }
