@@ -30,8 +30,8 @@ BufPosScaleOffTfm AxisAligned(double dfScale, double dfFirst) {
 
 // A turned grid, of which some corners lie outside.
 std::unique_ptr<BufPosArrayTfm> Turned() {
-    auto pafCol = std::make_unique<float[]>(kTgtCols * kTgtRows);
-    auto pafRow = std::make_unique<float[]>(kTgtCols * kTgtRows);
+    auto pafCol = std::make_unique<float[]>(std::size_t{kTgtCols} * kTgtRows);
+    auto pafRow = std::make_unique<float[]>(std::size_t{kTgtCols} * kTgtRows);
     for (int i = 0; i < kTgtCols * kTgtRows; ++i) {
         const auto x = static_cast<float>(i % kTgtCols);
         const auto y = static_cast<float>(i / kTgtCols);
