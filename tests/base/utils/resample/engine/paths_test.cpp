@@ -23,6 +23,7 @@ constexpr int kSrcCols = 1300;
 constexpr int kSrcRows = 210;
 constexpr int kTgtCols = 900;
 constexpr int kTgtRows = 40;
+constexpr std::size_t kTgtPixels = std::size_t{kTgtCols} * std::size_t{kTgtRows};
 
 BufPosScaleOffTfm AxisAligned(double dfScale, double dfFirst) {
     return {kTgtCols, kTgtRows, dfScale, dfFirst, 1.25, 3.0, 0, 0};
@@ -30,8 +31,8 @@ BufPosScaleOffTfm AxisAligned(double dfScale, double dfFirst) {
 
 // A turned grid, of which some corners lie outside.
 std::unique_ptr<BufPosArrayTfm> Turned() {
-    auto pafCol = std::make_unique<float[]>(std::size_t{kTgtCols} * kTgtRows);
-    auto pafRow = std::make_unique<float[]>(std::size_t{kTgtCols} * kTgtRows);
+    auto pafCol = std::make_unique<float[]>(kTgtPixels);
+    auto pafRow = std::make_unique<float[]>(kTgtPixels);
     for (int i = 0; i < kTgtCols * kTgtRows; ++i) {
         const auto x = static_cast<float>(i % kTgtCols);
         const auto y = static_cast<float>(i / kTgtCols);
@@ -142,7 +143,7 @@ TEST_P(PathsOfMethod, MasksAndChannelsGiveThePlainResult) {
         const IBufPosTfm& oTfm =
             oRandom.Chance(0.5) ? static_cast<const IBufPosTfm&>(oAligned) : *poTurned;
         engine::RunOptions oOptions;
-        std::vector<unsigned char> vbyOutcome(kTgtCols * kTgtRows);
+        std::vector<unsigned char> vbyOutcome(kTgtPixels);
         oOptions.pabyOutcome = vbyOutcome.data();
         oOptions.ePath = engine::Path::ePlain;
         const auto vbyPlain = RunOn(oSrc, eType, oTfm, oInfo, oOptions);
