@@ -33,7 +33,7 @@ BufPosScaleOffTfm AxisAligned(double dfScale, double dfFirst) {
 std::unique_ptr<BufPosArrayTfm> Turned() {
     auto pafCol = std::make_unique<float[]>(kTgtPixels);
     auto pafRow = std::make_unique<float[]>(kTgtPixels);
-    for (int i = 0; i < kTgtCols * kTgtRows; ++i) {
+    for (std::size_t i = 0; i < kTgtPixels; ++i) {
         const auto x = static_cast<float>(i % kTgtCols);
         const auto y = static_cast<float>(i / kTgtCols);
         pafCol[i] = -20.0f + 1.4f * x - 0.3f * y;
