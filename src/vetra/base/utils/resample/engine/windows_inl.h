@@ -5,6 +5,7 @@
 //   Row(k, p)             the first samples of row k, as many as p has elements, an even number
 //   Quad(k, j, p)         the samples of row k, columns j to j + 3
 //   Sample(k, j)          the sample of row k, column j
+//   PixelPair(k, p)       of all channels, three or four, the first two pixels of row k
 //   Get<Parameters>()     what the method prepared for the run
 //   Scratch()             the thread's working memory, as the method asked for
 //   ColumnInput<Filter>(dx) RowInput<Filter>(dy)   what a filter is made from
