@@ -93,6 +93,15 @@ void CheckRefusals(const char* pszCols, const char* pszSigma, Function fnCall) {
                        std::string("Row sigma of ") + pszSigma + sMust},
                       [&] { fnCall(kMost, kMost, 1.0f, fSigma); });
     }
+    for (const int nSize : {300001, kMost}) {
+        const std::string sSize = std::to_string(nSize);
+        ExpectRefusal({"nWndNumCols", 1, sSize, "<= 300000",
+                       "Num cols for gaussian must be at most 300000"},
+                      [&] { fnCall(nSize, nSize, 1.0f, 1.0f); });
+        ExpectRefusal({"nWndNumRows", 1, sSize, "<= 300000",
+                       "Num rows for gaussian must be at most 300000"},
+                      [&] { fnCall(1, nSize, 1.0f, 1.0f); });
+    }
 }
 
 TEST(GaussianKernel, Refusals) {
@@ -121,12 +130,16 @@ void CheckFactors() {
                          std::sqrt(std::max(fFactor, 1.1f) * std::max(fFactor, 1.1f) - 1.0f) * 0.5f,
                          std::sqrt(1.1f * 1.1f - 1.0f) * 0.5f));
     }
-    for (const float fFactor : {0.999f, 0.0f, -3.0f, std::nanf(""), 1e9f, 1e30f, HUGE_VALF}) {
+    for (const float fFactor :
+         {0.999f, 0.0f, -3.0f, std::nanf(""), 100001.0f, 433333333.0f, 1e30f, HUGE_VALF}) {
         const std::string sFactor = FormatString("%f", static_cast<double>(fFactor));
-        const char* pszRest = " downsampling factor for gaussian must be a positive number";
-        ExpectRefusal({"fDsFactorCol", 1, sFactor, ">= 1.0", std::string("Col") + pszRest},
+        const bool bMuch = fFactor > 1.0f;
+        const std::string sExpected = bMuch ? "<= 100000" : ">= 1.0";
+        const std::string sRest = std::string(" downsampling factor for gaussian must be ") +
+                                  (bMuch ? "at most 100000" : "a positive number");
+        ExpectRefusal({"fDsFactorCol", 1, sFactor, sExpected, "Col" + sRest},
                       [&] { R(fFactor, 0.0f); });
-        ExpectRefusal({"fDsFactorRow", 1, sFactor, ">= 1.0", std::string("Row") + pszRest},
+        ExpectRefusal({"fDsFactorRow", 1, sFactor, sExpected, "Row" + sRest},
                       [&] { R(1.0f, fFactor); });
     }
 }
@@ -134,6 +147,9 @@ void CheckFactors() {
 TEST(GaussianResampler, Factors) {
     CheckFactors<GaussianResampler>();
     CheckFactors<SqGaussianResampler>();
+    // The largest factor has the largest kernel.
+    EXPECT_EQ(GaussianResampler(100000.0f, 1.0f).GetResampleInfo().mvdfKernelWeights.size(),
+              65u * 300002u);
 }
 
 TEST(GaussianResampler, Refusals) {

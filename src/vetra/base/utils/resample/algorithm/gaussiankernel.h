@@ -12,8 +12,8 @@
 /// The taps of a phase add up to 1. A small window cuts the tails and keeps the shape. With a sigma
 /// below about 0.013 all taps of the middle phases underflow, and these phases hold NaN.
 ///
-/// \param nWndNumCols  taps of a column kernel, at least 1
-/// \param nWndNumRows  taps of a row kernel, at least 1
+/// \param nWndNumCols  taps of a column kernel, 1 to 300000
+/// \param nWndNumRows  taps of a row kernel, 1 to 300000
 /// \param fSigmaCol    standard deviation of the column kernels in pixels, above 0 and finite
 /// \param fSigmaRow    standard deviation of the row kernels in pixels, above 0 and finite
 /// \param vdfWeights   takes the kernels; unchanged when the call throws

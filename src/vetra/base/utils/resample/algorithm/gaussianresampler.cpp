@@ -1,6 +1,7 @@
 #include "vetra/base/utils/resample/algorithm/gaussianresampler.h"
 
 #include <cmath>
+#include <string>
 
 #include "vetra/base/utils/resample/algorithm/gaussiankernel.h"
 #include "vetra/base/utils/resample/algorithm/resamplerinfo.h"
@@ -22,19 +23,25 @@ struct Axes {
 };
 
 Axis AxisOfFactor(float fFactor, const char* pszArgument, const char* pszAxis) {
-    // In single precision throughout. A NaN becomes a NaN here, and is refused below.
-    const float f = fFactor <= 1.1f ? 1.1f : fFactor;
-    const float fSigma = std::sqrt(f * f - 1.0f) * 0.5f;
-    const float fHalf = std::floor(fSigma * 3.0f + 0.5f);
-    constexpr float kTooLarge = 1 << 30;  // twice that is no int
-    if (fFactor < 1.0f || !(fHalf < kTooLarge)) {
+    const auto fnRefuse = [&](const std::string& sExpected, const std::string& sMust) {
         throw ParameterException(
             pszArgument, ParameterException::eInvalid,
-            FormatString("%f", static_cast<double>(fFactor)), ">= 1.0",
-            FormatString("%s downsampling factor for gaussian must be a positive number", pszAxis),
+            FormatString("%f", static_cast<double>(fFactor)), sExpected,
+            FormatString("%s downsampling factor for gaussian must be %s", pszAxis, sMust.c_str()),
             VETRA_HERE);
+    };
+    // A NaN is refused too.
+    if (!(fFactor >= 1.0f)) {
+        fnRefuse(">= 1.0", "a positive number");
     }
-    const int nHalf = static_cast<int>(fHalf);
+    if (fFactor > static_cast<float>(kMaxGaussianFactor)) {
+        fnRefuse(FormatString("<= %d", kMaxGaussianFactor),
+                 FormatString("at most %d", kMaxGaussianFactor));
+    }
+    // In single precision throughout.
+    const float f = fFactor <= 1.1f ? 1.1f : fFactor;
+    const float fSigma = std::sqrt(f * f - 1.0f) * 0.5f;
+    const int nHalf = static_cast<int>(std::floor(fSigma * 3.0f + 0.5f));
     return {2 * (nHalf < 1 ? 1 : nHalf), fSigma};
 }
 

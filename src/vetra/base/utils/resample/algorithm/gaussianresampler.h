@@ -10,8 +10,8 @@ namespace vetra::utils {
 /// floor(position). An even size has one pixel more on the right or lower side.
 class VETRA_EXPORT GaussianResampler : public IRasterResampler {
  public:
-    /// \param nWndNumCols  window columns, at least 1
-    /// \param nWndNumRows  window rows, at least 1
+    /// \param nWndNumCols  window columns, 1 to 300000
+    /// \param nWndNumRows  window rows, 1 to 300000
     /// \param fSigmaCol    standard deviation along the columns in pixels, above 0 and finite
     /// \param fSigmaRow    standard deviation along the rows in pixels, above 0 and finite
     /// \throws ParameterException for an argument outside its range.
@@ -20,13 +20,11 @@ class VETRA_EXPORT GaussianResampler : public IRasterResampler {
     /// The kernel that keeps aliasing out of an image reduced by a factor f: sigma is
     /// sqrt(f^2 - 1) / 2, the window reaches over 3 sigma to each side and has an even size.
     /// Factors below 1.1 count as 1.1, so that even factor 1 smooths a little. The weights take
-    /// about 3 kB times f for each axis.
+    /// about 1.6 kB times f for each axis.
     ///
-    /// \param fDsFactorCol  source pixels per target pixel along the columns, at least 1
-    /// \param fDsFactorRow  source pixels per target pixel along the rows, at least 1
-    /// \throws ParameterException for a factor below 1, for NaN, and for a factor (above 7e8)
-    /// whose
-    ///         window size doesn't fit an int.
+    /// \param fDsFactorCol  source pixels per target pixel along the columns, 1 to 100000
+    /// \param fDsFactorRow  source pixels per target pixel along the rows, 1 to 100000
+    /// \throws ParameterException for a factor outside its range, NaN included.
     GaussianResampler(float fDsFactorCol, float fDsFactorRow);
     GaussianResampler(const GaussianResampler& oOther);
     ~GaussianResampler() override;

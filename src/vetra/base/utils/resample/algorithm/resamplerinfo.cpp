@@ -97,6 +97,18 @@ void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSig
     };
     fnCheckSigma(fSigmaCol, "fSigmaCol", "Col");
     fnCheckSigma(fSigmaRow, "fSigmaRow", "Row");
+    const auto fnCheckMost = [&](int nSize, const char* pszArgument, const char* pszAxis) {
+        if (nSize > kMaxGaussianTaps) {
+            throw ParameterException(pszArgument, ParameterException::eInvalid,
+                                     FormatString("%d", nSize),
+                                     FormatString("<= %d", kMaxGaussianTaps),
+                                     FormatString("Num %s for gaussian must be at most %d", pszAxis,
+                                                  kMaxGaussianTaps),
+                                     pszFile, pszFunction, nLine);
+        }
+    };
+    fnCheckMost(nWndNumCols, "nWndNumCols", "cols");
+    fnCheckMost(nWndNumRows, "nWndNumRows", "rows");
 }
 
 void CheckKernelSize(int nWndNumCols, int nWndNumRows, int nSubPixels, const char* pszFile,

@@ -48,8 +48,15 @@ constexpr GaussianTexts kGaussianTexts{"gaussian", "gaussian", "gaussian"};
 /// Their odd spellings are what callers know.
 constexpr GaussianTexts kSqGaussianTexts{"guassian", "gaussian", "Gaussian"};
 
+/// The largest factor that a Gaussian kernel is made for. It keeps the weights of both axes below
+/// 320 MB.
+constexpr int kMaxGaussianFactor = 100000;
+/// The size of the kernel of that factor.
+constexpr int kMaxGaussianTaps = 3 * kMaxGaussianFactor;
+
 /// Refuses a window of less than one column or row, then a sigma that is not above 0 or not finite,
-/// columns first, with `ParameterException`.
+/// then a window of more than `kMaxGaussianTaps` columns or rows, columns first, with
+/// `ParameterException`.
 void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSigmaRow,
                    const GaussianTexts& oTexts, const char* pszFile, const char* pszFunction,
                    std::uint32_t nLine);
