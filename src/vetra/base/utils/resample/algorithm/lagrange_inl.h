@@ -2,11 +2,16 @@
 // Filters of separable methods; see separable_inl.h. Included inside a level's namespace.
 //
 // At a fraction of exactly 0 the value is the sample there, without arithmetic.
+//
+// Distances to nodes are differences of doubles from 0 to 7, and at most one of them is below 1/2:
+// a product of them is 0 or at least 2^-52. With samples that are 0 or at least 2^-149 in size, as
+// integers, floats and their roots are, no term and no sum of terms lies between 0 and 2^-400. Only
+// samples of type double may make smaller ones.
 
 // The quotients of some numbers by integers.
 template <int N>
-inline void DivideAll(F64 (&x)[N], const Divisor (&aoDivisor)[N]) {
-    if (!AnyTiny(x)) {
+inline void DivideAll(bool bMayBeTiny, F64 (&x)[N], const Divisor (&aoDivisor)[N]) {
+    if (!bMayBeTiny || !AnyTiny(x)) {
         for (int k = 0; k < N; ++k) {
             x[k] = DivideBy(x[k], aoDivisor[k]);
         }
@@ -27,23 +32,30 @@ struct Lagrange4Filter {
           d0(oInput.frac + Set1(1.0)),
           d1(d0 - Set1(1.0)),
           d2(d0 - Set1(2.0)),
-          d3(d0 - Set1(3.0)) {}
+          d3(d0 - Set1(3.0)),
+          halfD3(d3 * Set1(0.5)),
+          bMayBeTiny(oInput.bMayBeTiny) {}
 
     template <typename Samples>
     F64 Value(const Samples& fnSample) const {
         const F64 p[kTaps] = {fnSample(0), fnSample(1), fnSample(2), fnSample(3)};
-        const F64 half = Set1(0.5);
+        // Half of a product is the product with half of a factor, unless it is subnormal.
+        const auto fnHalved = [&](F64 product) {
+            return bMayBeTiny ? product * d3 * Set1(0.5) : product * halfD3;
+        };
         constexpr Divisor kSix = MakeDivisor(6);
         constexpr Divisor kaoDivisor[2] = {kSix, kSix};
         F64 outer[2] = {d1 * p[0] * d2 * d3, p[3] * d0 * d1 * d2};
-        DivideAll(outer, kaoDivisor);
+        DivideAll(bMayBeTiny, outer, kaoDivisor);
         const F64 value =
-            p[1] * d0 * d2 * d3 * half - outer[0] - p[2] * d0 * d1 * d3 * half + outer[1];
+            fnHalved(p[1] * d0 * d2) - outer[0] - fnHalved(p[2] * d0 * d1) + outer[1];
         return Select(onNode, p[1], value);
     }
 
     B64 onNode;
     F64 d0, d1, d2, d3;
+    F64 halfD3;
+    bool bMayBeTiny;
 };
 
 // Degree 7, through nodes 0 to 7; t is measured from node 3.
@@ -51,7 +63,8 @@ struct Lagrange8Filter {
     static constexpr int kTaps = 8;
     static constexpr bool kTabulated = false;
 
-    explicit Lagrange8Filter(const FilterInput& oInput) : onNode(oInput.frac == Set1(0.0)) {
+    explicit Lagrange8Filter(const FilterInput& oInput)
+        : onNode(oInput.frac == Set1(0.0)), bMayBeTiny(oInput.bMayBeTiny) {
         const F64 u = oInput.frac + Set1(3.0);
         F64 distance[kTaps];
         for (int k = 0; k < kTaps; ++k) {
@@ -80,7 +93,7 @@ struct Lagrange8Filter {
             term[k] = p * product[k];
             node = k == 3 ? p : node;
         }
-        DivideAll(term, kaoDivisor);
+        DivideAll(bMayBeTiny, term, kaoDivisor);
         const F64 value =
             term[1] - term[0] - term[2] + term[3] - term[4] + term[5] - term[6] + term[7];
         return Select(onNode, node, value);
@@ -88,4 +101,5 @@ struct Lagrange8Filter {
 
     B64 onNode;
     F64 product[kTaps];
+    bool bMayBeTiny;
 };

@@ -156,6 +156,7 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
     moWindows.padfColumnTaps = mpadfTaps.get();
     moWindows.pParameters = oTask.pParameters;
     moWindows.padfScratch = mpadfScratch.get();
+    moWindows.bMayBeTiny = oTask.nSrcType == gobs::eDT_64R;
 }
 
 void RowCache::SetStrip(const Strip& oStrip) {

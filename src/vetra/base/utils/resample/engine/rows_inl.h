@@ -59,7 +59,7 @@ VETRA_STAGE void Across(const RowWindows& oRows, const double* padfRow, double* 
         nTaps = static_cast<const KernelTables*>(oRows.pParameters)->nCols;
     }
     ForEachRowGroup(oRows, [&](int i, const auto& oWindow) {
-        FilterInput oInput{Load(oRows.padfFracCol + i), nullptr, nTaps};
+        FilterInput oInput{Load(oRows.padfFracCol + i), nullptr, nTaps, oRows.bMayBeTiny};
         if constexpr (Filter::kTabulated) {
             oInput.padfTaps = oRows.padfColumnTaps + std::int64_t{i} * nTaps;
         }
@@ -77,7 +77,7 @@ inline void StoreRowValue(double* p, F64 value) {
 template <typename Filter, bool kSquared>
 VETRA_STAGE void Down(const RowWindows& oRows, double* padfValue) {
     const F64 dy = Set1(oRows.dfFracRow);
-    FilterInput oInput{dy, oRows.padfScratch, Filter::kTaps};
+    FilterInput oInput{dy, oRows.padfScratch, Filter::kTaps, oRows.bMayBeTiny};
     if constexpr (Filter::kTabulated) {
         const KernelTables& oTables = *static_cast<const KernelTables*>(oRows.pParameters);
         GatherDownTaps(oTables, dy, oRows.padfScratch);

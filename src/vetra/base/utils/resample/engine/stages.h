@@ -113,6 +113,7 @@ struct RowWindows {
     const void* pParameters;
     double* padfScratch;
     int nPix;
+    bool bMayBeTiny;  ///< the samples are doubles, which can be nearly 0 without being 0
 };
 
 /// How to pick the pairs of samples of eight pixels out of sixteen adjacent 8-bit samples.

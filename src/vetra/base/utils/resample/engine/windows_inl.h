@@ -14,6 +14,9 @@
 // Whether samples of this type can make a NaN.
 template <typename T>
 inline constexpr bool kIsFloating = T(0.5) != T(0);
+// Whether they, or their products with weights, can be nearly 0 without being 0.
+template <typename T>
+inline constexpr bool kMayBeTiny = kIsFloating<T> && sizeof(T) == sizeof(double);
 
 // The size of a method's windows where each run has its own.
 constexpr int kAnySize = 0;
@@ -24,6 +27,8 @@ struct FilterInput {
     // For a filter with tabulated weights: kLanes of them for each tap.
     const double* padfTaps;
     int nTaps;
+    // Products of samples may be so small that they lose digits, or that DivideBy can't divide them.
+    bool bMayBeTiny;
 };
 
 // The tabulated phase nearest to a fraction. Pixels without a window may have any fraction, NaN
@@ -134,9 +139,9 @@ struct WindowReader {
         if constexpr (Filter::kTabulated) {
             const KernelTables& oTables = Get<KernelTables>();
             GatherAcrossTaps(oTables, dx, Scratch());
-            return {dx, Scratch(), oTables.nCols};
+            return {dx, Scratch(), oTables.nCols, kMayBeTiny<T>};
         } else {
-            return {dx, nullptr, Filter::kTaps};
+            return {dx, nullptr, Filter::kTaps, kMayBeTiny<T>};
         }
     }
     template <typename Filter>
@@ -146,9 +151,9 @@ struct WindowReader {
             // Behind those of the columns.
             double* padfTaps = Scratch() + oTables.nCols * kLanes;
             GatherDownTaps(oTables, dy, padfTaps);
-            return {dy, padfTaps, oTables.nRows};
+            return {dy, padfTaps, oTables.nRows, kMayBeTiny<T>};
         } else {
-            return {dy, nullptr, Filter::kTaps};
+            return {dy, nullptr, Filter::kTaps, kMayBeTiny<T>};
         }
     }
 
