@@ -95,12 +95,12 @@ void CheckRefusals(const char* pszCols, const char* pszSigma, Function fnCall) {
     }
     for (const int nSize : {300001, kMost}) {
         const std::string sSize = std::to_string(nSize);
-        ExpectRefusal({"nWndNumCols", 1, sSize, "<= 300000",
-                       "Num cols for gaussian must be at most 300000"},
-                      [&] { fnCall(nSize, nSize, 1.0f, 1.0f); });
-        ExpectRefusal({"nWndNumRows", 1, sSize, "<= 300000",
-                       "Num rows for gaussian must be at most 300000"},
-                      [&] { fnCall(1, nSize, 1.0f, 1.0f); });
+        ExpectRefusal(
+            {"nWndNumCols", 1, sSize, "<= 300000", "Num cols for gaussian must be at most 300000"},
+            [&] { fnCall(nSize, nSize, 1.0f, 1.0f); });
+        ExpectRefusal(
+            {"nWndNumRows", 1, sSize, "<= 300000", "Num rows for gaussian must be at most 300000"},
+            [&] { fnCall(1, nSize, 1.0f, 1.0f); });
     }
 }
 

@@ -372,6 +372,50 @@ INSTANTIATE_TEST_SUITE_P(Statistics, UnitScale,
                          MethodName);
 
 // A forced level is the one that runs, and the best one is the default.
+// Samples near both ends of their type's range, at positions on nodes, next to them and between:
+// products that lose digits or overflow, and quotients of products that do neither.
+TEST(Lagrange, SamplesAtTheEndsOfTheRangeEqualPlainEvaluation) {
+    constexpr int kSize = 40;
+    Random oRandom(11);
+    for (const NativeDataTypeCode eType : {eDT_32R, eDT_64R}) {
+        Image oSrc(eType, kSize, kSize, 1, false);
+        for (std::size_t i = 0; i < oSrc.nSamples; ++i) {
+            const bool bFloat = eType == eDT_32R;
+            const int nLeast = bFloat ? -149 : -1074;
+            const int nExponent =
+                oRandom.Pick({nLeast, oRandom.Int(nLeast, nLeast + 200), bFloat ? 127 : 1015});
+            const double df = std::ldexp(oRandom.Pick({0.0, 1.0, oRandom.Real(-2, 2)}), nExponent);
+            const float f = static_cast<float>(df);
+            bFloat ? std::memcpy(oSrc.oSamples.Get() + i * sizeof f, &f, sizeof f)
+                   : std::memcpy(oSrc.oSamples.Get() + i * sizeof df, &df, sizeof df);
+        }
+        for (const ResampleMethod eMethod :
+             {eRM_LAGRANGE4, eRM_LAGRANGE8, eRM_SQLAGRANGE4, eRM_SQLAGRANGE8}) {
+            ResampleInfo oInfo = MakeResampler(eMethod)->GetResampleInfo();
+            oInfo.mbClampBgd = false;
+            for (const double dfFirst : {0.0, 0x1p-52, 0x1p-50, 0.5, 1 - 0x1p-53, 0.3}) {
+                const BufPosScaleOffTfm oTfm(kSize, kSize, 1.0, dfFirst, 1.0, dfFirst, 0, 0);
+                Image oExpected(eDT_64R, kSize, kSize, 1, false);
+                std::vector<unsigned char> vbyOutcome;
+                ReferenceResample(oSrc.oBuffer, oExpected.oBuffer, oTfm, oInfo, vbyOutcome);
+                for (const engine::Level eLevel : engine::GetSupportedLevels()) {
+                    for (const engine::Path ePath : {engine::Path::eBest, engine::Path::ePlain}) {
+                        Image oTgt(eDT_64R, kSize, kSize, 1, false);
+                        engine::RunOptions oOptions;
+                        oOptions.eLevel = eLevel;
+                        oOptions.ePath = ePath;
+                        engine::Resample(oSrc.oBuffer, oTgt.oBuffer, oTfm, oInfo, oOptions);
+                        EXPECT_EQ(0, std::memcmp(oExpected.oSamples.Get(), oTgt.oSamples.Get(),
+                                                 oTgt.oSamples.Size()))
+                            << eMethod << " at " << dfFirst << ", level "
+                            << static_cast<int>(eLevel);
+                    }
+                }
+            }
+        }
+    }
+}
+
 TEST(Levels, AreDistinctAndOrdered) {
     const auto veLevels = engine::GetSupportedLevels();
     ASSERT_FALSE(veLevels.empty());

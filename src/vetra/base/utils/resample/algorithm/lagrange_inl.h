@@ -4,7 +4,7 @@
 // At a fraction of exactly 0 the value is the sample there, without arithmetic.
 //
 // Distances to nodes are differences of doubles from 0 to 7, and at most one of them is below 1/2:
-// a product of them is 0 or at least 2^-52. With samples that are 0 or at least 2^-149 in size, as
+// a product of them is 0 or at least 2^-53. With samples that are 0 or at least 2^-149 in size, as
 // integers, floats and their roots are, no term and no sum of terms lies between 0 and 2^-400. Only
 // samples of type double may make smaller ones.
 
@@ -39,7 +39,8 @@ struct Lagrange4Filter {
     template <typename Samples>
     F64 Value(const Samples& fnSample) const {
         const F64 p[kTaps] = {fnSample(0), fnSample(1), fnSample(2), fnSample(3)};
-        // Half of a product is the product with half of a factor, unless it is subnormal.
+        // Half of a product is the product with half of a factor, unless that is subnormal or the
+        // product overflows.
         const auto fnHalved = [&](F64 product) {
             return bMayBeTiny ? product * d3 * Set1(0.5) : product * halfD3;
         };
@@ -47,8 +48,7 @@ struct Lagrange4Filter {
         constexpr Divisor kaoDivisor[2] = {kSix, kSix};
         F64 outer[2] = {d1 * p[0] * d2 * d3, p[3] * d0 * d1 * d2};
         DivideAll(bMayBeTiny, outer, kaoDivisor);
-        const F64 value =
-            fnHalved(p[1] * d0 * d2) - outer[0] - fnHalved(p[2] * d0 * d1) + outer[1];
+        const F64 value = fnHalved(p[1] * d0 * d2) - outer[0] - fnHalved(p[2] * d0 * d1) + outer[1];
         return Select(onNode, p[1], value);
     }
 

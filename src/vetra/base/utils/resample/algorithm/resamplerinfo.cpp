@@ -99,12 +99,11 @@ void CheckGaussian(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSig
     fnCheckSigma(fSigmaRow, "fSigmaRow", "Row");
     const auto fnCheckMost = [&](int nSize, const char* pszArgument, const char* pszAxis) {
         if (nSize > kMaxGaussianTaps) {
-            throw ParameterException(pszArgument, ParameterException::eInvalid,
-                                     FormatString("%d", nSize),
-                                     FormatString("<= %d", kMaxGaussianTaps),
-                                     FormatString("Num %s for gaussian must be at most %d", pszAxis,
-                                                  kMaxGaussianTaps),
-                                     pszFile, pszFunction, nLine);
+            throw ParameterException(
+                pszArgument, ParameterException::eInvalid, FormatString("%d", nSize),
+                FormatString("<= %d", kMaxGaussianTaps),
+                FormatString("Num %s for gaussian must be at most %d", pszAxis, kMaxGaussianTaps),
+                pszFile, pszFunction, nLine);
         }
     };
     fnCheckMost(nWndNumCols, "nWndNumCols", "cols");

@@ -27,7 +27,8 @@ struct FilterInput {
     // For a filter with tabulated weights: kLanes of them for each tap.
     const double* padfTaps;
     int nTaps;
-    // Products of samples may be so small that they lose digits, or that DivideBy can't divide them.
+    // The samples are doubles: products may overflow, or be so small that they lose digits or that
+    // DivideBy can't divide them.
     bool bMayBeTiny;
 };
 
