@@ -1,12 +1,14 @@
 #!/usr/bin/env bash
-# Installs the Debian packages of the named groups that are missing: build, tool, tests, demo, guide,
-# bench.
+# Installs the Debian packages of the named groups that are missing: build, tool, tests, packages, roots,
+# demo, guide, bench.
 set -euo pipefail
 
 declare -A groups=(
     [build]="g++ cmake ninja-build"
     [tool]="libgdal-dev libcli11-dev"
     [tests]="clang libclang-rt-dev libomp-dev libgtest-dev libeigen3-dev libgeographiclib-dev pkg-config"
+    [packages]="dpkg-dev lintian"
+    [roots]="debootstrap"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
     [bench]="libbenchmark-dev libopencv-dev libeigen3-dev libfftw3-dev libgeographiclib-dev"

@@ -1,34 +1,17 @@
 # Installs the build into a scratch folder and uses it from there: find_package, pkg-config, every
 # header alone. Then looks at what the shared library exports.
 
-function(run)
-    execute_process(COMMAND ${ARGN} COMMAND_ERROR_IS_FATAL ANY)
-endfunction()
+include(${CMAKE_CURRENT_LIST_DIR}/outside.cmake)
 
 set(prefix ${WORK_DIR}/prefix)
 file(REMOVE_RECURSE ${WORK_DIR})
 run(${CMAKE_COMMAND} --install ${BUILD_DIR} --prefix ${prefix} --config ${CONFIG})
-run(${CMAKE_COMMAND} -S ${SOURCE_DIR} -B ${WORK_DIR}/build -G ${GENERATOR}
-    -DCMAKE_CXX_COMPILER=${CXX} -DCMAKE_PREFIX_PATH=${prefix} -DCMAKE_BUILD_TYPE=Debug)
-run(${CMAKE_COMMAND} --build ${WORK_DIR}/build)
+build_outside(${SOURCE_DIR} ${WORK_DIR}/build ${prefix})
 file(GLOB programs ${WORK_DIR}/build/*consumer)
 foreach(program IN LISTS programs)
     run(${program})
 endforeach()
-
-find_program(pkg_config pkg-config)
-if(pkg_config)
-    if(NOT SHARED_LIBRARY)
-        set(static --static)
-    endif()
-    set(ENV{PKG_CONFIG_PATH} ${prefix}/${LIB_DIR}/pkgconfig)
-    execute_process(COMMAND ${pkg_config} --define-variable=prefix=${prefix} --cflags --libs ${static}
-        "vetra = ${VERSION}" OUTPUT_VARIABLE flags COMMAND_ERROR_IS_FATAL ANY)
-    separate_arguments(flags UNIX_COMMAND "${flags}")
-    run(${CXX} -std=c++17 ${SOURCE_DIR}/consumer.cpp -o ${WORK_DIR}/pkg_config_consumer ${flags})
-    set(ENV{LD_LIBRARY_PATH} ${prefix}/${LIB_DIR})
-    run(${WORK_DIR}/pkg_config_consumer)
-endif()
+run_by_pkg_config(${SOURCE_DIR}/consumer.cpp ${WORK_DIR}/pkg_config_consumer ${prefix})
 
 if(SHARED_LIBRARY)
     execute_process(COMMAND ${NM} -D --defined-only ${SHARED_LIBRARY} OUTPUT_VARIABLE symbols
