@@ -1,7 +1,9 @@
 #ifndef VETRA_VETRA_H
 #define VETRA_VETRA_H
 
+/// \file
 /// Every public header.
+
 #include "vetra/base/utils/fs/filelister.h"
 #include "vetra/base/utils/fs/fileutils.h"
 #include "vetra/base/utils/geo/ellipcalc.h"
@@ -72,5 +74,22 @@
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/textcore/formatstring.h"
 #include "vetra/version.h"
+
+/// The library. Helpers that have no state stand in the global namespace.
+namespace vetra {
+/// Types of raster data.
+namespace gobs {}
+/// Quaternions.
+namespace qtn {}
+/// Time.
+namespace tsys {}
+/// Resampling, and what it stands on.
+namespace utils {
+/// Copies of pixels whose types are known at run time.
+namespace low {}
+/// Arrays of numbers.
+namespace math {}
+}  // namespace utils
+}  // namespace vetra
 
 #endif  // VETRA_VETRA_H

@@ -12,6 +12,7 @@ class VETRA_EXPORT Timestamp {
  public:
     /// Zero.
     Timestamp() : Timestamp(0.0, 0.0) {}
+    /// The sum of two numbers of days.
     Timestamp(double dfDays, double dfFraction) : mdfDays(dfDays), mdfFraction(dfFraction) {}
 
     /// The span from the other time to this one, part by part.

@@ -5,6 +5,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Text by `printf` formats.
+
 /// Formats like `printf` in the C locale, whatever locale the process has set, and returns the
 /// text, of any length. So numbers have a decimal point everywhere, and can be read back.
 ///

@@ -38,6 +38,7 @@ class VETRA_EXPORT FileLister {
 
     /// Copies search nothing: they have the pairs that were found.
     FileLister(const FileLister&) = default;
+    /// As the copy constructor.
     FileLister& operator=(const FileLister&) = default;
     ~FileLister() = default;
 

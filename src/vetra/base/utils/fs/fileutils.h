@@ -6,9 +6,10 @@
 
 #include "vetra/export.h"
 
-// A path is a sequence of bytes, with "/" between its parts. A path that holds a zero byte names
-// nothing. Links are followed: a link is what it leads to, and one that leads nowhere doesn't
-// exist. Everything that exists and is no directory counts as a file, pipes and devices too.
+/// \file
+/// A path is a sequence of bytes, with "/" between its parts. A path that holds a zero byte names
+/// nothing. Links are followed: a link is what it leads to, and one that leads nowhere doesn't
+/// exist. Everything that exists and is no directory counts as a file, pipes and devices too.
 
 /// Whether the path exists and is no directory.
 VETRA_EXPORT bool IsFile(const std::string& path);

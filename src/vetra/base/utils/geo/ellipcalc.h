@@ -31,6 +31,7 @@ class VETRA_EXPORT EllipCalc {
     /// Same ellipsoid and height tolerance, both to 2.220446049250313e-16, and the same earth-fixed
     /// local origin, to 1e-6 m.
     bool operator==(const EllipCalc& oOther) const;
+    /// The opposite of `operator==`.
     bool operator!=(const EllipCalc& oOther) const { return !(*this == oOther); }
 
     /// Sets the ellipsoid. The local frame stays as it was computed on the earlier ellipsoid, until
@@ -44,6 +45,7 @@ class VETRA_EXPORT EllipCalc {
 
     /// Height tolerance of `ProjectToHeight` in metres, not checked. 0.0001 by default.
     void SetHgtTol(double dfHgtTol);
+    /// Height tolerance of `ProjectToHeight` in metres.
     double GetHgtTol() const;
 
     /// Puts the local frame at a geodetic point of the current ellipsoid.
@@ -76,6 +78,7 @@ class VETRA_EXPORT EllipCalc {
     /// The same from the latitude's sine and cosine.
     double PrimeVerticalRadius(double dfSinLat, double dfCosLat) const;
 
+    /// Geodetic to earth-fixed coordinates.
     void GeoToXYZ(double dfLon, double dfLat, double dfHgt, double& X, double& Y, double& Z) const;
 
     /// On the axis the longitude is 0, the latitude pi/2 or -pi/2 (pi/2 at the centre), and the
@@ -87,12 +90,16 @@ class VETRA_EXPORT EllipCalc {
     /// Longitude of `XYZToGeo`.
     void XYZToLon(double X, double Y, double Z, double& dfLon) const;
 
+    /// Position of an earth-fixed point in the local frame: translated and turned.
     void EcfToLsr(double X, double Y, double Z, double& dfEast, double& dfNorth,
                   double& dfUp) const;
+    /// Earth-fixed coordinates of a point of the local frame.
     void LsrToEcf(double dfEast, double dfNorth, double dfUp, double& X, double& Y,
                   double& Z) const;
+    /// Position of a geodetic point in the local frame.
     void GeoToLsr(double dfLon, double dfLat, double dfHgt, double& dfEast, double& dfNorth,
                   double& dfUp) const;
+    /// Geodetic coordinates of a point of the local frame, as of `XYZToGeo`.
     void LsrToGeo(double dfEast, double dfNorth, double dfUp, double& dfLon, double& dfLat,
                   double& dfHgt) const;
     /// Against the local origin (\p dfLon0, \p dfLat0, \p dfHgt0) in place of the object's own.
@@ -120,6 +127,7 @@ class VETRA_EXPORT EllipCalc {
     /// \returns 0
     int ProjectToHeight(const double* padfOrigin, const double* padfDirection, double dfHgt,
                         double& dfRange, double* padfPoint, double* padfGeo) const;
+    /// The same without the geodetic coordinates.
     int ProjectToHeight(const double* padfOrigin, const double* padfDirection, double dfHgt,
                         double& dfRange, double* padfPoint) const;
 
@@ -141,7 +149,7 @@ class VETRA_EXPORT EllipCalc {
                                    double dfHgt, double* padfPoint, double& dfRange) const;
 
  private:
-    /// \param bPoleForm  a closed form takes the place of the iteration very close to a pole
+    /// With the pole form a closed form takes the place of the iteration very close to a pole.
     void LatHgt(double p2, double Z, bool bPoleForm, double& dfLat, double& dfHgt) const;
     /// Newton's method for the tangent of the latitude.
     double NewtonTanLat(double p, double Z) const;

@@ -3,6 +3,7 @@
 
 #include "vetra/export.h"
 
+/// \file
 /// Geodetic functions that take the ellipsoid on each call: a is its semi-major axis in metres, e2
 /// its first eccentricity squared, from 0 to below 1. For many conversions on one ellipsoid see
 /// `EllipCalc`, which has the same frames:
@@ -18,15 +19,19 @@
 /// state. Accuracy is that of `EllipCalc`.
 
 /// (0, 0, 0) for a = 0.
+/// @{
 VETRA_EXPORT void GeoToXYZ(double dfLon, double dfLat, double dfHgt, double a, double e2, double& X,
                            double& Y, double& Z);
 VETRA_EXPORT void GeoToXYZ(const double* padfGeo, double a, double e2, double* padfXyz);
+/// @}
 
 /// On the axis the longitude is 0, the latitude pi/2 or -pi/2 (pi/2 at the centre), and the height
 /// |Z| - b. On the half plane of longitude pi the longitude is pi, never -pi.
+/// @{
 VETRA_EXPORT void XYZToGeo(double X, double Y, double Z, double a, double e2, double& dfLon,
                            double& dfLat, double& dfHgt);
 VETRA_EXPORT void XYZToGeo(const double* padfXyz, double a, double e2, double* padfGeo);
+/// @}
 
 /// Position of a geodetic point in the local frame at a geodetic origin.
 VETRA_EXPORT void GeoToLSR(const double* padfGeo, const double* padfOriginGeo, double a, double e2,
@@ -53,6 +58,8 @@ VETRA_EXPORT double GetAzimuth(double x1, double y1, double x2, double y2);
 /// to 5 cm for 10 km, 5 m for 100 km and 400 m for 1000 km.
 ///
 /// \param padfVector  earth-fixed direction, of any length whose square is a normal double
+/// \param a           semi-major axis in metres
+/// \param e2          first eccentricity squared
 /// \param h           height in metres
 /// \param padfPoint   out: earth-fixed X, Y, Z in metres
 /// \returns 0, or -1 with nothing written for a zero vector or one with NaN
@@ -63,6 +70,8 @@ VETRA_EXPORT int ProjectOriginToEllipsoid(const double* padfVector, double a, do
 ///
 /// \param padfOrigin     earth-fixed X, Y, Z in metres, outside of the enlarged ellipsoid
 /// \param padfDirection  earth-fixed; should be of unit length, as it is used as given
+/// \param a              semi-major axis in metres
+/// \param e2             first eccentricity squared
 /// \param h              height in metres
 /// \param padfPoint      out: earth-fixed X, Y, Z in metres
 /// \returns 0, or -1 with nothing written: the ray doesn't point to the centre's side, misses or
@@ -79,6 +88,8 @@ VETRA_EXPORT int ProjectToEllipsoid(const double* padfOrigin, const double* padf
 ///
 /// \param padfOrigin      earth-fixed X, Y, Z in metres
 /// \param padfDirection   earth-fixed, of unit length
+/// \param a               semi-major axis in metres
+/// \param e2              first eccentricity squared
 /// \param h               wanted height in metres
 /// \param padfPoint       in: first guess, out: the point on the ray, earth-fixed metres
 /// \param dfTol           height tolerance in metres

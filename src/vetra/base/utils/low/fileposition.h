@@ -5,7 +5,12 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Positions in files of any size.
+
 /// `fseek` with a 64-bit offset.
+/// \param file    an open file
+/// \param offset  bytes from the origin, forwards
 /// \param origin  SEEK_SET, SEEK_CUR or SEEK_END
 /// \return 0 on success
 VETRA_EXPORT int FSeek(std::FILE* file, long long offset, int origin);

@@ -29,6 +29,7 @@ class VETRA_EXPORT ConvexHull {
     /// \param points  at least one; coordinates are finite
     /// \throws ParameterException for no points, and for coordinates that are NaN or infinite.
     explicit ConvexHull(std::vector<std::pair<double, double>> points);
+    /// Takes over points and hull.
     ConvexHull& operator=(const ConvexHull& oOther);
     ~ConvexHull();
 
@@ -55,7 +56,9 @@ class VETRA_EXPORT ConvexHull {
     bool IsInside(std::pair<double, double> point) const;
 
  protected:
+    /// No points, and no hull.
     ConvexHull();
+    /// No points and no hull, whatever the other holds: assign to copy a hull.
     ConvexHull(const ConvexHull& oOther);
 
  private:

@@ -5,39 +5,60 @@
 
 #include "vetra/export.h"
 
-// Regular grids of vector-valued samples, with linear interpolation between them, for one, two and
-// three axes. The three classes are alike; what is said of InterpGrid3D goes for the others with
-// fewer axes.
+/// \file
+/// Regular grids of vector-valued samples, with linear interpolation between them, for one, two and
+/// three axes. The three classes are alike; what is said of InterpGrid3D goes for the others with
+/// fewer axes.
 
 struct InterpGridAccess;
 
 /// A grid over one axis; see InterpGrid3D.
 class VETRA_EXPORT InterpGrid1D {
  public:
+    /// Dimension 1, no layout.
     InterpGrid1D();
+    /// Copies the array too.
     InterpGrid1D(const InterpGrid1D& oOther);
+    /// Copies the array too. When there is no memory for it (std::bad_alloc) the grid is left
+    /// without layout.
     InterpGrid1D& operator=(const InterpGrid1D& oOther);
     ~InterpGrid1D();
 
+    /// Number of doubles at each point.
     unsigned int GetDimension() const { return dimension; }
+    /// As `InterpGrid3D::SetDimension`.
+    /// \throws std::bad_alloc when there is no memory for the new array.
     void SetDimension(unsigned int nDimension);
 
+    /// Discards what there is and lays the grid out from start to end of each axis, as
+    /// `InterpGrid3D::LayoutGrid`.
+    /// \throws std::bad_alloc as that one
     void LayoutGrid(double dfStart, double dfEnd, double dfSpacing);
+    /// Interpolates linearly, and extrapolates outside, as `InterpGrid3D::GetVal`. \p padfOut takes
+    /// [dimension] doubles; NaN if the grid has no layout.
     void GetVal(double x, double* padfOut) const;
     /// \param padfOut  takes [points] doubles
     void GetGridPositions(double* padfOut) const;
 
+    /// The number of points; 0 without layout.
     void GetGridSize(unsigned int& nNumPoints) const;
+    /// The number of points; 0 without layout.
     std::size_t GetNumGridPoints() const { return numPoints; }
+    /// Position of the first point; 0 without layout.
     void GetOffset(double& dfOffset) const;
+    /// Distance of neighbouring points; 1 without layout.
     void GetSpacing(double& dfSpacing) const;
     /// [points x dimension]
     double* GetArray() const { return values; }
+    /// Size of the array in bytes, modulo 2^32.
     unsigned int GetArraySizeBytes() const;
 
  protected:
+    /// Makes the members those of a new grid, whatever they were: frees nothing.
     void Init();
+    /// What the assignment does.
     void CopyFrom(const InterpGrid1D& oOther);
+    /// Frees the array. The dimension stays, the layout goes.
     void Clear();
 
  private:
@@ -53,31 +74,51 @@ class VETRA_EXPORT InterpGrid1D {
 /// A grid over two axes; see InterpGrid3D.
 class VETRA_EXPORT InterpGrid2D {
  public:
+    /// Dimension 1, no layout.
     InterpGrid2D();
+    /// Copies the array too.
     InterpGrid2D(const InterpGrid2D& oOther);
+    /// Copies the array too. When there is no memory for it (std::bad_alloc) the grid is left
+    /// without layout.
     InterpGrid2D& operator=(const InterpGrid2D& oOther);
     ~InterpGrid2D();
 
+    /// Number of doubles at each point.
     unsigned int GetDimension() const { return dimension; }
+    /// As `InterpGrid3D::SetDimension`.
+    /// \throws std::bad_alloc when there is no memory for the new array.
     void SetDimension(unsigned int nDimension);
 
+    /// Discards what there is and lays the grid out from start to end of each axis, as
+    /// `InterpGrid3D::LayoutGrid`.
+    /// \throws std::bad_alloc as that one
     void LayoutGrid(double dfStartX, double dfStartY, double dfEndX, double dfEndY,
                     double dfSpacingX, double dfSpacingY);
+    /// Interpolates linearly, and extrapolates outside, as `InterpGrid3D::GetVal`. \p padfOut takes
+    /// [dimension] doubles; NaN if the grid has no layout.
     void GetVal(double x, double y, double* padfOut) const;
     /// \param padfOut  takes [points X x points Y x 2] doubles, pairs of x and y
     void GetGridPositions(double* padfOut) const;
 
+    /// The numbers of points; 0 without layout.
     void GetGridSize(unsigned int& nNumPointsX, unsigned int& nNumPointsY) const;
+    /// The product of the numbers of points.
     std::size_t GetNumGridPoints() const;
+    /// Position of the first point on each axis; 0 without layout.
     void GetOffsets(double& dfOffsetX, double& dfOffsetY) const;
+    /// Distance of neighbouring points on each axis; 1 without layout.
     void GetSpacing(double& dfSpacingX, double& dfSpacingY) const;
     /// [points X x points Y x dimension]
     double* GetArray() const { return values; }
+    /// Size of the array in bytes, modulo 2^32.
     unsigned int GetArraySizeBytes() const;
 
  protected:
+    /// Makes the members those of a new grid, whatever they were: frees nothing.
     void Init();
+    /// What the assignment does.
     void CopyFrom(const InterpGrid2D& oOther);
+    /// Frees the array. The dimension stays, the layout goes.
     void Clear();
 
  private:
@@ -110,9 +151,12 @@ class VETRA_EXPORT InterpGrid2D {
 /// `GetVal` and the getters may run concurrently on one grid.
 class VETRA_EXPORT InterpGrid3D {
  public:
+    /// Dimension 1, no layout.
     InterpGrid3D();
     /// Copies the array too.
     InterpGrid3D(const InterpGrid3D& oOther);
+    /// Copies the array too. When there is no memory for it (std::bad_alloc) the grid is left
+    /// without layout.
     InterpGrid3D& operator=(const InterpGrid3D& oOther);
     ~InterpGrid3D();
 
@@ -144,6 +188,9 @@ class VETRA_EXPORT InterpGrid3D {
     /// the sum of sample times weight over the cell's corners in the order of the array, a corner's
     /// weight being (X times Y) times Z.
     ///
+    /// \param x        position along the first axis
+    /// \param y        position along the second axis
+    /// \param z        position along the third axis
     /// \param padfOut  takes [dimension] doubles; NaN if the grid has no layout
     void GetVal(double x, double y, double z, double* padfOut) const;
 
@@ -156,7 +203,9 @@ class VETRA_EXPORT InterpGrid3D {
                      unsigned int& nNumPointsZ) const;
     /// The product of the numbers of points.
     std::size_t GetNumGridPoints() const;
+    /// Position of the first point on each axis; 0 without layout.
     void GetOffsets(double& dfOffsetX, double& dfOffsetY, double& dfOffsetZ) const;
+    /// Distance of neighbouring points on each axis; 1 without layout.
     void GetSpacing(double& dfSpacingX, double& dfSpacingY, double& dfSpacingZ) const;
     /// The samples, to be read and written; null without layout. The grid owns them: they are valid
     /// until its layout or its dimension changes.
@@ -165,8 +214,11 @@ class VETRA_EXPORT InterpGrid3D {
     unsigned int GetArraySizeBytes() const;
 
  protected:
+    /// Makes the members those of a new grid, whatever they were: frees nothing.
     void Init();
+    /// What the assignment does.
     void CopyFrom(const InterpGrid3D& oOther);
+    /// Frees the array. The dimension stays, the layout goes.
     void Clear();
 
  private:

@@ -5,10 +5,11 @@
 
 #include "vetra/export.h"
 
-// Interpolation of samples by Lagrange's polynomial: M. Abramowitz, I. A. Stegun, "Handbook of
-// Mathematical Functions", 25.2.1 and 25.2.2. Nodes that coincide give infinities or NaN. A
-// position is on a node if it is less than the machine epsilon of double, 2.220446049250313e-16,
-// away.
+/// \file
+/// Interpolation of samples by Lagrange's polynomial: M. Abramowitz, I. A. Stegun, "Handbook of
+/// Mathematical Functions", 25.2.1 and 25.2.2. Nodes that coincide give infinities or NaN. A
+/// position is on a node if it is less than the machine epsilon of double, 2.220446049250313e-16,
+/// away.
 
 /// \p out = (1 - \p t) \p a + \p t \p b.
 VETRA_EXPORT void interpolate_linear(const double& a, const double& b, const double& t,
@@ -32,6 +33,8 @@ VETRA_EXPORT void interpolate_Lagrange(const double& x0, const double& x1, const
 ///
 /// \param vdfX  nodes
 /// \param vdfY  samples, at least as many
+/// \param x     position
+/// \param out   takes the value
 /// \throws ParameterException for fewer samples than nodes; \p out stays as it was.
 VETRA_EXPORT void interpolate_Lagrange(const std::vector<double>& vdfX,
                                        const std::vector<double>& vdfY, const double& x,
@@ -66,6 +69,7 @@ VETRA_EXPORT void interpolate_Lagrange_rate(const double& x0, const double& x1, 
 /// \param y0,y1,y2,y3  the samples
 /// \param t            position in units of \p h, counted from the node of \p y1
 /// \param h            distance of the nodes
+/// \param out          takes the derivative
 VETRA_EXPORT void interpolate_Lagrange_rate(const double& y0, const double& y1, const double& y2,
                                             const double& y3, const double& t, const double& h,
                                             double& out);

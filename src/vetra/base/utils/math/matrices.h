@@ -5,15 +5,18 @@
 
 #include "vetra/export.h"
 
-// Dense matrices as arrays of row pointers, and vectors of any length. Element i of the array
-// points to row i, row by row anywhere in memory. Dimensions are counts of rows and columns; with
-// counts below 1 nothing is done. Only `AllocMat` throws, and only for want of memory. An output
-// may overlap an input in `VecSclMult` and `MatSclMult` alone, and there only as the same array.
+/// \file
+/// Dense matrices as arrays of row pointers, and vectors of any length. Element i of the array
+/// points to row i, row by row anywhere in memory. Dimensions are counts of rows and columns; with
+/// counts below 1 nothing is done. Only `AllocMat` throws, and only for want of memory. An output
+/// may overlap an input in `VecSclMult` and `MatSclMult` alone, and there only as the same array.
 
 /// Makes a matrix of one array of row pointers and one contiguous block, row-major. The content is
 /// not initialised. Negative counts are taken as 0.
 ///
 /// \param papadfMat  takes the matrix, for `FreeMat`; what it held before is not freed
+/// \param nRows      rows
+/// \param nCols      columns
 /// \throws std::bad_alloc if there is no memory; papadfMat is left as it was.
 VETRA_EXPORT void AllocMat(double**& papadfMat, int nRows, int nCols);
 
@@ -75,6 +78,7 @@ VETRA_EXPORT int mat_inv(double* const* a, int n, bool bMirror);
 ///
 /// \param c        nDegree + 1 coefficients
 /// \param nDegree  0.0 is the result for a negative one
+/// \param x        position
 VETRA_EXPORT double polyval(const double* c, int nDegree, double x);
 
 /// Prints a matrix to the standard output: a line "Matrix: name (rows by columns)", then blocks of

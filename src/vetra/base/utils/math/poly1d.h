@@ -29,7 +29,9 @@ class VETRA_EXPORT Poly1D {
     /// A copy that belongs to the caller.
     Poly1D* Clone() const;
 
+    /// The order plus 1.
     int GetNumCoeffs() const { return mnNumCoeffs; }
+    /// Highest power that has a coefficient, which may be 0.
     int GetPolyOrder() const { return mnNumCoeffs - 1; }
     /// The polynomial's own array of `GetNumCoeffs` doubles, valid until the coefficients change.
     const double* GetCoeffs() const { return mpadfCoeffs; }
@@ -94,7 +96,10 @@ class VETRA_EXPORT Poly1D {
     void UpdateCoeffs(int nCount, const double* padfCoeffs);
 
  protected:
+    /// Makes the members those of an object without coefficients and with the default parameters
+    /// of `GetInverse`. Frees nothing.
     void Init();
+    /// What the assignment does.
     void CopyFrom(const Poly1D& oOther);
 
  private:

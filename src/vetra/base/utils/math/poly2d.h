@@ -6,6 +6,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Polynomials in two variables, and integer powers.
+
 /// A polynomial in two variables, with all terms up to a total degree, its order.
 ///
 /// **Coefficients.** (order + 1)(order + 2) / 2, degree by degree from 0 up, and within a degree
@@ -32,6 +35,7 @@ class VETRA_EXPORT Poly2D {
     /// \param vdfCoeffs  exactly (nOrder + 1)(nOrder + 2) / 2 entries
     /// \throws ParameterException for other arguments.
     Poly2D(int nOrder, const std::vector<double>& vdfCoeffs);
+    /// Copies the coefficients.
     Poly2D(const Poly2D& oOther);
     /// When it throws (std::bad_alloc) the polynomial is as it was.
     Poly2D& operator=(const Poly2D& oOther);
@@ -39,7 +43,9 @@ class VETRA_EXPORT Poly2D {
     /// A copy that belongs to the caller.
     Poly2D* Clone() const;
 
+    /// Highest total degree that has coefficients, which may all be 0.
     int GetPolyOrder() const { return mnOrder; }
+    /// (order + 1)(order + 2) / 2.
     int GetNumCoeffs() const { return GetNumCoeffsForOrder(mnOrder); }
     /// The polynomial's own array of `GetNumCoeffs` doubles, valid until the polynomial changes.
     const double* GetCoeffs() const { return mpadfCoeffs; }
@@ -91,8 +97,11 @@ class VETRA_EXPORT Poly2D {
     void UpdateCoeffs(int nCount, const double* padfCoeffs);
 
  protected:
+    /// Makes the members those of an object without coefficients. Frees nothing.
     void Init();
+    /// What the assignment does.
     void CopyFrom(const Poly2D& oOther);
+    /// Finds out anew whether the polynomial counts as zero, after a change of coefficients.
     void CheckIfNonZero();
 
  private:

@@ -3,6 +3,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Sine and cosine together.
+
 /// Sine and cosine of one angle, as `std::sin` and `std::cos` give them.
 ///
 /// \param x  angle in radians; an infinity or NaN gives NaN

@@ -3,9 +3,10 @@
 
 #include "vetra/export.h"
 
-// Vectors of three doubles and 3 x 3 matrices of nine, row-major. Outputs may be inputs. Nothing
-// throws. There are two families, whose cross products differ: `CrossProd` gives a unit vector,
-// `CrossProduct` doesn't.
+/// \file
+/// Vectors of three doubles and 3 x 3 matrices of nine, row-major. Outputs may be inputs. Nothing
+/// throws. There are two families, whose cross products differ: `CrossProd` gives a unit vector,
+/// `CrossProduct` doesn't.
 
 /// Stores the dot product of two vectors.
 VETRA_EXPORT void DotProduct(const double* a, const double* b, double* pdfResult);

@@ -9,6 +9,7 @@ namespace vetra::utils {
 
 /// One block of a target, and the source pixels that it needs.
 struct ResampleBlock {
+    /// The block, in pixels of the whole target.
     PixelRect oTarget;
     /// Holds at least one pixel, also for a block that maps outside the source.
     PixelRect oSource;
@@ -40,6 +41,10 @@ class VETRA_EXPORT BlockPlanner {
     /// a power of two where the target is cut. Where even a single pixel needs more, blocks are
     /// single pixels.
     ///
+    /// \param oTfm            transform of the whole target
+    /// \param nSrcCols        source columns, at least 1
+    /// \param nSrcRows        source rows, at least 1
+    /// \param oResampler      gives the margins that a position needs; not kept
     /// \param nSrcPixelBytes  bytes that the caller keeps per source pixel, masks included
     /// \param nTgtPixelBytes  bytes per target pixel
     /// \param nMaxBytes       limit for one block
@@ -47,8 +52,11 @@ class VETRA_EXPORT BlockPlanner {
                  const IRasterResampler& oResampler, long long nSrcPixelBytes,
                  long long nTgtPixelBytes, long long nMaxBytes);
 
+    /// Columns of a block; the last ones of a row may be narrower.
     int GetBlockCols() const { return mnBlockCols; }
+    /// Rows of a block; the last ones may be lower.
     int GetBlockRows() const { return mnBlockRows; }
+    /// How many blocks cover the target.
     long long GetNumBlocks() const;
     /// A block, from 0 to `GetNumBlocks() - 1`, counted row by row.
     ///

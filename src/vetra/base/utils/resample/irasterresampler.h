@@ -28,6 +28,7 @@ enum WindowAnchorPoint : int {
 /// `SetResampleInfo` and `SetWindowExtents` in the constructor.
 class VETRA_EXPORT IRasterResampler {
  public:
+    /// Cubic sampling by `ResampleInfo`'s defaults, with the window of a single pixel.
     IRasterResampler();
     virtual ~IRasterResampler();
 
@@ -38,7 +39,9 @@ class VETRA_EXPORT IRasterResampler {
     virtual void Resample(const ResampleBuffer& oSrc, ResampleBuffer& oTgt,
                           const IBufPosTfm& oTfm) const;
 
+    /// The method.
     virtual ResampleMethod GetResampleType() const;
+    /// The method's own parameters, as text.
     virtual CoefficientMap GetCoefficients() const;
 
     /// The window, relative to its anchor pixel.
@@ -57,17 +60,27 @@ class VETRA_EXPORT IRasterResampler {
     /// read for position (x, y). \p nLeft and \p nTop are 0 or negative.
     virtual void GetSrcBufferMargins(int& nLeft, int& nTop, int& nRight, int& nBottom) const;
 
+    /// Limits of computed values.
     virtual void GetClampRange(double& dfClampMin, double& dfClampMax) const;
+    /// Whether computed values are kept off the background value.
     virtual bool GetClampBgdFlag() const;
+    /// The background value.
     virtual double GetOutBgd() const;
+    /// What replaces an interpolation whose window lacks valid pixels.
     virtual NodataFillAction GetNodataFillAction() const;
+    /// All parameters, as the free `Resample` takes them.
     virtual ResampleInfo GetResampleInfo() const;
 
     /// \throws ParameterException when \p dfClampMin is greater than \p dfClampMax; the range stays
     ///         as it was then.
     virtual void SetClampRange(double dfClampMin, double dfClampMax);
+    /// Whether computed values are to be kept off the background value: those that would equal it
+    /// are moved by one step, see `PixelClamp`.
     virtual void SetClampBgdFlag(bool bClampBgd);
+    /// The value of pixels that nothing is computed for. It is saturated to the target's type and,
+    /// for an integer type, cut toward zero when it is written; clamp limits don't apply to it.
     virtual void SetOutBgd(double dfOutBgd);
+    /// What is to replace an interpolation whose window lacks valid pixels.
     virtual void SetNodataFillAction(NodataFillAction eFillAction);
 
  protected:
@@ -76,8 +89,10 @@ class VETRA_EXPORT IRasterResampler {
     /// Takes over all parameters and the window of another object.
     virtual void CopyFrom(const IRasterResampler& oOther);
 
+    /// As `CopyFrom`.
     IRasterResampler(const IRasterResampler& oOther);
 
+    /// Replaces all parameters: method, coefficients, weights, clamp range, background and fill.
     void SetResampleInfo(const ResampleInfo& oInfo);
     /// Stores the window and derives the right and bottom margins: the last offset of the window,
     /// plus 1 where the anchor is the nearest pixel, which can lie one beyond the floor.

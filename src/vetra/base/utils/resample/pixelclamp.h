@@ -39,10 +39,15 @@ class VETRA_EXPORT PixelClamp {
     /// that the step is lost in rounding, a sample can still equal it.
     void Clamp(double dfValue, T* pTarget) const { mpfClamp(*this, dfValue, pTarget); }
 
+    /// The low limit that computed samples keep to.
     T GetLow() const { return mLow; }
+    /// The high limit that computed samples keep to.
     T GetHigh() const { return mHigh; }
+    /// The background value, as a sample; 0 without one.
     T GetBackground() const { return mBackground; }
+    /// Values closer to the background than this count as equal to it; 0 for an integer T.
     T GetTolerance() const { return mTolerance; }
+    /// Whether the clamp was made with a background.
     bool HasBackground() const { return mbHasBackground; }
     /// Whether values are tested against the background: it lies between the limits.
     bool AvoidsBackground() const;

@@ -48,6 +48,10 @@ VETRA_EXPORT void Resample(const ResampleBuffer& oSrc, ResampleBuffer& oTgt, con
 
 /// As above, and tells what became of each target pixel, for instance to write a validity mask.
 ///
+/// \param oSrc         the source; only read
+/// \param oTgt         the target, as above
+/// \param oTfm         gives the position of each target pixel
+/// \param oResParms    method and parameters
 /// \param pabyOutcome  `[target rows x target columns]` bytes, filled with `PixelOutcome` values;
 ///                     not null. Unchanged when the call throws.
 /// \throws ParameterException also for a null \p pabyOutcome.

@@ -32,6 +32,10 @@ class VETRA_EXPORT ResampleBuffer {
 
     /// Takes the caller's arrays as they are.
     ///
+    /// \param eType     as above
+    /// \param nNumCols  columns, at least 1
+    /// \param nNumRows  rows, at least 1
+    /// \param nNumChan  channels, at least 1
     /// \param pabyBuf   columns x rows x channels samples; not null, aligned for the sample type
     /// \param pabyMask  columns x rows mask bytes, or null
     /// \param bOwner    true hands both arrays over: they must come from `new unsigned char[]`.
@@ -46,15 +50,23 @@ class VETRA_EXPORT ResampleBuffer {
     ResampleBuffer& operator=(const ResampleBuffer& oOther);
     virtual ~ResampleBuffer();
 
+    /// The samples, to be read and written; cast to the sample type.
     unsigned char* GetBuf() { return mpabyBuf; }
+    /// The samples; cast to the sample type.
     const unsigned char* GetBuf() const { return mpabyBuf; }
     /// Null when the buffer has no mask.
     unsigned char* GetMask() { return mpabyMask; }
+    /// Null when the buffer has no mask.
     const unsigned char* GetMask() const { return mpabyMask; }
+    /// The sample type.
     gobs::NativeDataTypeCode GetDatatype() const { return meType; }
+    /// Columns.
     int GetNumCols() const { return mnNumCols; }
+    /// Rows.
     int GetNumRows() const { return mnNumRows; }
+    /// Channels; a complex sample counts once.
     int GetNumChan() const { return mnNumChan; }
+    /// Whether the arrays are the buffer's own.
     bool GetOwnerFlag() const { return mbOwner; }
 
  private:

@@ -4,6 +4,9 @@
 #include "vetra/base/utils/resample/resampleinfo.h"
 #include "vetra/export.h"
 
+/// \file
+/// What becomes of a target pixel, for one position.
+
 /// What becomes of a target pixel, for a method whose window is counted from the floor of the
 /// position.
 ///

@@ -4,6 +4,9 @@
 #include "vetra/base/utils/resample/resampleinfo.h"
 #include "vetra/export.h"
 
+/// \file
+/// The windows of the sinc methods.
+
 namespace vetra::utils {
 
 /// The windows, with the names that the coefficient "SHAPINGWINDOW" gives them.
@@ -20,19 +23,25 @@ enum ShapingWindowType : int {
 /// The taper that a truncated sinc is multiplied with. A new one is of type NONE.
 class VETRA_EXPORT ShapingWindow {
  public:
+    /// The type NONE.
     void SetNone();
+    /// The type PARABOLA.
     void SetParabola();
     /// \param dfBeta  shape, from -25 to 25; the sign has no effect, 0 is a box
     /// \throws ParameterException for any other value, NaN included; the window stays as it was.
     void SetKaiser(double dfBeta);
+    /// The type HANN.
     void SetHann();
+    /// The type HAMMING.
     void SetHamming();
+    /// The type LANCZOS.
     void SetLanczos();
     /// \param dfSigma  standard deviation in half widths of the window; the sign has no effect. Not
     ///                 checked: with 0, and below about 0.003, a sinc table has no weight left and
     ///                 holds NaN.
     void SetGaussian(double dfSigma);
 
+    /// The type that was set last.
     ShapingWindowType GetType() const;
     /// The shape that `SetKaiser` set last, else 0.
     double GetBeta() const;

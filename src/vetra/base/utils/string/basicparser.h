@@ -18,6 +18,7 @@ class VETRA_EXPORT BasicParser {
     ///         be read.
     explicit BasicParser(const std::string& fileName);
 
+    /// Takes over the text of another parser.
     BasicParser& operator=(const BasicParser& oOther);
     ~BasicParser();
 
@@ -30,6 +31,7 @@ class VETRA_EXPORT BasicParser {
     ///
     /// The time is linear in the lengths of text and key.
     ///
+    /// \param key    keywords, with colons between them
     /// \param value  receives the word; empty when the keywords are there but nothing behind them,
     ///               unchanged when a keyword isn't there
     /// \return whether a word was found

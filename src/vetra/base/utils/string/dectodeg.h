@@ -5,6 +5,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Angles in degrees, minutes and seconds, as fields; numbers in two formats.
+
 /// Splits an angle into degrees, minutes and seconds.
 ///
 /// The angle is reduced to one turn first. A latitude is folded at the poles (100 is 80 north), a
@@ -31,6 +34,8 @@ VETRA_EXPORT void DecimalToDegrees(double value, char* szFormat, int* degrees, i
 /// between the bounds or is below 1e-15, else with \p otherFormat. A magnitude that equals a bound
 /// doesn't lie between them, nor does a NaN.
 ///
+/// \param value                the number
+/// \param upper, lower         the bounds of the magnitude
 /// \param format, otherFormat  `printf` formats for one double
 VETRA_EXPORT std::string FormatDouble(const double& value, const double& upper, const double& lower,
                                       const char* format, const char* otherFormat);

@@ -3,6 +3,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Angles in degrees, minutes and seconds, as text.
+
 /// Writes an angle as text. Reduced, folded and split as by `DecimalToDegrees`.
 ///
 ///     from     angle      text for 5.5

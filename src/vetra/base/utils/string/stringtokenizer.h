@@ -19,11 +19,14 @@
 /// Taking all tokens is linear in the length of the text, and so is one call of `CountTokens`.
 class VETRA_EXPORT StringTokenizer : public ITokenizer {
  public:
+    /// \param text       the text to cut
+    /// \param delimiter  what cuts it, as a whole
     StringTokenizer(const std::string& text, const std::string& delimiter);
 
     /// The delimiter is one blank.
     explicit StringTokenizer(const std::string& text);
 
+    /// Takes over the text that is left, and the delimiter.
     StringTokenizer& operator=(const StringTokenizer& oOther);
     ~StringTokenizer() override;
 

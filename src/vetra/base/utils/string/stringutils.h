@@ -6,9 +6,10 @@
 
 #include "vetra/export.h"
 
-// A character is one byte: no encoding is recognised, zero bytes are ordinary, and bytes above 127
-// are neither space nor letter. Character classes are those of the C locale, whatever locale the
-// process has set. Where nothing else is said the time is linear in the length of the arguments.
+/// \file
+/// A character is one byte: no encoding is recognised, zero bytes are ordinary, and bytes above 127
+/// are neither space nor letter. Character classes are those of the C locale, whatever locale the
+/// process has set. Where nothing else is said the time is linear in the length of the arguments.
 
 /// The text without white space at its end and at its start. White space is what `isspace` accepts
 /// in the C locale: blank, tab, line feed, carriage return, vertical tab and form feed.

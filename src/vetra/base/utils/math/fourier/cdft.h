@@ -4,25 +4,26 @@
 #include "vetra/base/utils/math/fourier/fftcomplex.h"
 #include "vetra/export.h"
 
-// Fourier transforms with a table that is made beforehand: complex, in float, of lengths that are
-// powers of two. For one long-lived array of work memory and less of it, see complexdft.h.
-//
-// With flag true a transform is  X[k] = sum over j of x[j] exp(-2 pi i j k / n),  with flag false
-// the exponent is positive. Neither is scaled: one after the other multiplies every sample by n
-// (by n^2 in two dimensions).
-//
-// Arithmetic: radix-2 passes of the strides l = 1, 2, 4 ... n/2, each from an array x to an array
-// y. For j below n / (2 l) and k below l, with u = x[j l + k], v = x[j l + k + n/2] and c, s of
-// table entry j l (s negated where flag is false),
-//
-//     y[2 j l + k]     = u + v
-//     y[2 j l + l + k] = (dr c - di s) + i (dr s + di c),  d = u - v
-//
-// Every operation is rounded to float and none is left out. So the bits depend neither on the
-// processor nor on the number of threads (of a NaN only that it is one). The L2 error relative to
-// the exact transform is below 5e-8 sqrt(log2 n) for data of ordinary size, n up to 2^20.
-// Source: P. N. Swarztrauber, "FFT algorithms for vector computers", Parallel Computing 1, 1984
-// (the self-sorting form by Stockham).
+/// \file
+/// Fourier transforms with a table that is made beforehand: complex, in float, of lengths that are
+/// powers of two. For one long-lived array of work memory and less of it, see complexdft.h.
+///
+/// With flag true a transform is  X[k] = sum over j of x[j] exp(-2 pi i j k / n),  with flag false
+/// the exponent is positive. Neither is scaled: one after the other multiplies every sample by n
+/// (by n^2 in two dimensions).
+///
+/// Arithmetic: radix-2 passes of the strides l = 1, 2, 4 ... n/2, each from an array x to an array
+/// y. For j below n / (2 l) and k below l, with u = x[j l + k], v = x[j l + k + n/2] and c, s of
+/// table entry j l (s negated where flag is false),
+///
+///     y[2 j l + k]     = u + v
+///     y[2 j l + l + k] = (dr c - di s) + i (dr s + di c),  d = u - v
+///
+/// Every operation is rounded to float and none is left out. So the bits depend neither on the
+/// processor nor on the number of threads (of a NaN only that it is one). The L2 error relative to
+/// the exact transform is below 5e-8 sqrt(log2 n) for data of ordinary size, n up to 2^20.
+/// Source: P. N. Swarztrauber, "FFT algorithms for vector computers", Parallel Computing 1, 1984
+/// (the self-sorting form by Stockham).
 
 /// Fills the table for length \p n: entry k below n/2 is cos(2 pi k / n) and -sin(2 pi k / n),
 /// computed in double from k times (2 pi / n) and rounded to float. Runs on all OpenMP threads.

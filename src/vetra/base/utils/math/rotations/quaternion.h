@@ -15,9 +15,12 @@ class VETRA_EXPORT Quaternion {
  public:
     /// (0, 0, 0, 0), which is not a rotation; the identity is (0, 0, 0, 1).
     Quaternion() = default;
+    /// The components as they are: nothing is normalised.
     Quaternion(const double& dfX, const double& dfY, const double& dfZ, const double& dfW)
         : mdfX(dfX), mdfY(dfY), mdfZ(dfZ), mdfW(dfW) {}
+    /// A copy.
     Quaternion(const Quaternion& oOther) = default;
+    /// A copy.
     Quaternion& operator=(const Quaternion& oOther) = default;
     virtual ~Quaternion() = default;
 
@@ -37,23 +40,33 @@ class VETRA_EXPORT Quaternion {
         }
     }
 
+    /// All four components times the factor.
     Quaternion operator*(double dfFactor) const;
+    /// Hamilton's product: this rotation, followed by the other.
     Quaternion operator*(const Quaternion& oOther) const;
+    /// Component by component.
     Quaternion operator+(const Quaternion& oOther) const;
+    /// Component by component.
     Quaternion operator-(const Quaternion& oOther) const;
+    /// All four components negated: the same rotation.
     Quaternion operator-() const;
     /// An unchanged copy if the divisor's magnitude is not above epsilon (so for NaN, too).
     Quaternion operator/(double dfDivisor) const;
     /// This times the inverse of the other.
     Quaternion operator/(const Quaternion& oOther) const;
 
+    /// All four components times the factor.
     Quaternion& operator*=(double dfFactor);
+    /// This becomes this times the other.
     Quaternion& operator*=(const Quaternion& oOther);
+    /// Component by component.
     Quaternion& operator+=(const Quaternion& oOther);
+    /// Component by component.
     Quaternion& operator-=(const Quaternion& oOther);
     /// Unchanged if the divisor's magnitude is below epsilon; unlike `operator/`, it divides by
     /// epsilon itself and by NaN.
     Quaternion& operator/=(double dfDivisor);
+    /// This becomes this times the inverse of the other.
     Quaternion& operator/=(const Quaternion& oOther);
 
     /// (-x, -y, -z, w): the inverse rotation of a unit quaternion.
@@ -104,6 +117,7 @@ class VETRA_EXPORT Quaternion {
     double mdfW = 0.0;
 };
 
+/// All four components times the factor.
 VETRA_EXPORT Quaternion operator*(double dfFactor, const Quaternion& oQuat);
 /// The scalar times the inverse of the quaternion.
 VETRA_EXPORT Quaternion operator/(double dfDividend, const Quaternion& oQuat);

@@ -3,18 +3,24 @@
 
 #include "vetra/export.h"
 
-// Quaternions as arrays of four doubles x, y, z, w, by the conventions of rotations.h; the same
-// operations as those of the class vetra::qtn::Quaternion, with some other thresholds.
-//
-// Results go into the last argument, which may be one of the inputs. Nothing throws. NaN in gives
-// NaN out. Magnitudes beyond 1e154 count as infinite. Epsilon is 2.220446049250313e-16.
+/// \file
+/// Quaternions as arrays of four doubles x, y, z, w, by the conventions of rotations.h; the same
+/// operations as those of the class vetra::qtn::Quaternion, with some other thresholds.
+///
+/// Results go into the last argument, which may be one of the inputs. Nothing throws. NaN in gives
+/// NaN out. Magnitudes beyond 1e154 count as infinite. Epsilon is 2.220446049250313e-16.
 
+/// Component by component.
+/// @{
 VETRA_EXPORT void QuatAdd(const double* padfA, const double* padfB, double* padfOut);
 VETRA_EXPORT void QuatSubtract(const double* padfA, const double* padfB, double* padfOut);
+/// @}
 
 /// (-x, -y, -z, w). For unit quaternions that is the inverse.
+/// @{
 VETRA_EXPORT void QuatConj(const double* padfQuat, double* padfOut);
 VETRA_EXPORT void UnitQuatInv(const double* padfQuat, double* padfOut);
+/// @}
 
 /// The sum of the products of the four components.
 VETRA_EXPORT double QuatDotProd(const double* padfA, const double* padfB);
@@ -23,6 +29,7 @@ VETRA_EXPORT double QuatMag(const double* padfQuat);
 
 /// Hamilton's product (i j = k): the rotation a followed by b.
 VETRA_EXPORT void QuatMult(const double* padfA, const double* padfB, double* padfOut);
+/// All four components times the factor.
 VETRA_EXPORT void QuatMultScalar(const double* padfQuat, const double& dfFactor, double* padfOut);
 
 /// The conjugate divided by the squared length; a copy if that is below epsilon.
@@ -35,9 +42,11 @@ VETRA_EXPORT void QuatNormalize(const double* padfQuat, double* padfOut);
 VETRA_EXPORT void QuatNormalizeSelf(double* padfQuat);
 
 /// The logarithm, exponential function and power: see `Log`, `Exp` and `Pow` of the class.
+/// @{
 VETRA_EXPORT void QuatLog(const double* padfQuat, double* padfOut);
 VETRA_EXPORT void QuatExp(const double* padfQuat, double* padfOut);
 VETRA_EXPORT void QuatPow(const double* padfQuat, const double& dfExponent, double* padfOut);
+/// @}
 
 /// (1 - t) a + t b, normalised by `QuatNormalize`.
 VETRA_EXPORT void QuatLerp(const double* padfA, const double* padfB, const double& dfT,

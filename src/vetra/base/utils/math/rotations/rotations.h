@@ -3,25 +3,27 @@
 
 #include "vetra/export.h"
 
-// Conventions of all rotations in the library
-//
-// Angles are radians. Frames are right-handed. A matrix M is 3 x 3, row-major (m0 m1 m2 is the
-// first row), and multiplies a column vector from the left: v' = M v.
-//
-// Signs are those of a rotation of the frame: v is fixed in space, M v are its components in a
-// frame that was turned by the positive angle (counterclockwise, seen from the tip of the axis).
-// With c and s the cosine and sine of the angle the elementary matrices are
-//
-//          | 1  0  0 |          | c  0 -s |          | c  s  0 |
-//     Rx = | 0  c  s |     Ry = | 0  1  0 |     Rz = |-s  c  0 |
-//          | 0 -s  c |          | s  0  c |          | 0  0  1 |
-//
-// so that Rz(a) (1, 0, 0) = (cos a, -sin a, 0). A rotation of the vector by the same angle (the
-// "active" convention) is the transposed matrix.
-//
-// Quaternions are stored x, y, z and then the scalar w. A unit quaternion and its negative are the
-// same rotation. Products are Hamilton's (i j = k); for the frame rotations above they read in the
-// order in which the rotations are applied: M(a b) = M(b) M(a).
+/// \file
+/// Conversions between the forms of a rotation, and the conventions of all rotations in the
+/// library.
+///
+/// Angles are radians. Frames are right-handed. A matrix M is 3 x 3, row-major (m0 m1 m2 is the
+/// first row), and multiplies a column vector from the left: v' = M v.
+///
+/// Signs are those of a rotation of the frame: v is fixed in space, M v are its components in a
+/// frame that was turned by the positive angle (counterclockwise, seen from the tip of the axis).
+/// With c and s the cosine and sine of the angle the elementary matrices are
+///
+///          | 1  0  0 |          | c  0 -s |          | c  s  0 |
+///     Rx = | 0  c  s |     Ry = | 0  1  0 |     Rz = |-s  c  0 |
+///          | 0 -s  c |          | s  0  c |          | 0  0  1 |
+///
+/// so that Rz(a) (1, 0, 0) = (cos a, -sin a, 0). A rotation of the vector by the same angle (the
+/// "active" convention) is the transposed matrix.
+///
+/// Quaternions are stored x, y, z and then the scalar w. A unit quaternion and its negative are the
+/// same rotation. Products are Hamilton's (i j = k); for the frame rotations above they read in the
+/// order in which the rotations are applied: M(a b) = M(b) M(a).
 
 /// The forms of a rotation, with the coefficients of each and the matrix that they stand for.
 ///
@@ -86,6 +88,8 @@ VETRA_EXPORT bool IsValidRotation(RotationType eType, const double* padfCoeffs);
 
 /// The matrix of a rotation. The coefficients aren't checked.
 ///
+/// \param eType       form of the rotation
+/// \param padfCoeffs  its coefficients: 3, 4, 4 or 9 by the type
 /// \param papadfRows  three rows of three doubles
 /// \returns 0, or -1 for a type outside 0 to 8; then the rows are left as they were.
 VETRA_EXPORT int RotToMatrix(RotationType eType, const double* padfCoeffs,
@@ -95,6 +99,8 @@ VETRA_EXPORT int RotToMatrix(RotationType eType, const double* padfCoeffs,
 /// isn't checked.
 ///
 /// \param papadfRows  three rows of three doubles
+/// \param eType       form of the result
+/// \param padfCoeffs  takes 3, 4, 4 or 9 coefficients by the type
 /// \returns 0, or -1 for a type outside 0 to 8; then the coefficients are left as they were.
 VETRA_EXPORT int MatrixToRot(const double* const* papadfRows, RotationType eType,
                              double* padfCoeffs);
@@ -144,13 +150,17 @@ VETRA_EXPORT int QuaternionToAxisAngle(const double* padfQuat, double* padfAxisA
 ///
 /// \param dfAngle     radians
 /// \param padfMatrix  takes 9 elements, row-major
+/// @{
 VETRA_EXPORT void XRotToMatrix(double dfAngle, double* padfMatrix);
 VETRA_EXPORT void YRotToMatrix(double dfAngle, double* padfMatrix);
 VETRA_EXPORT void ZRotToMatrix(double dfAngle, double* padfMatrix);
+/// @}
 
 /// The same into three rows of three doubles.
+/// @{
 VETRA_EXPORT void XRotToMatrix(double dfAngle, double* const* papadfRows);
 VETRA_EXPORT void YRotToMatrix(double dfAngle, double* const* papadfRows);
 VETRA_EXPORT void ZRotToMatrix(double dfAngle, double* const* papadfRows);
+/// @}
 
 #endif  // VETRA_BASE_UTILS_MATH_ROTATIONS_ROTATIONS_H

@@ -13,6 +13,7 @@ class VETRA_EXPORT AverageResampler : public IRasterResampler {
     /// \param nWndNumRows  window rows, at least 1
     /// \throws ParameterException for any other size.
     AverageResampler(int nWndNumCols, int nWndNumRows);
+    /// A copy with the same parameters.
     AverageResampler(const AverageResampler& oOther);
     ~AverageResampler() override;
     AverageResampler* Clone() const override;
@@ -28,6 +29,7 @@ class VETRA_EXPORT SqAverageResampler : public IRasterResampler {
     /// \param nWndNumRows  window rows, at least 1
     /// \throws ParameterException for any other size.
     SqAverageResampler(int nWndNumCols, int nWndNumRows);
+    /// A copy with the same parameters.
     SqAverageResampler(const SqAverageResampler& oOther);
     ~SqAverageResampler() override;
     SqAverageResampler* Clone() const override;

@@ -15,6 +15,7 @@ class VETRA_EXPORT CplxSarResampler : public IRasterResampler {
     /// \param dfFc         central frequency along the rows in cycles per pixel, from -0.5 to 0.5
     /// \throws ParameterException for any other value.
     CplxSarResampler(int nWndNumCols, int nWndNumRows, double dfFc);
+    /// A copy with the same parameters.
     CplxSarResampler(const CplxSarResampler& oOther);
     ~CplxSarResampler() override;
     CplxSarResampler* Clone() const override;

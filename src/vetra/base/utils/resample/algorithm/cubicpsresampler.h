@@ -10,7 +10,9 @@ namespace vetra::utils {
 /// of giving the window up, and a window that leaves the source gives the background.
 class VETRA_EXPORT CubicPsResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     CubicPsResampler();
+    /// A copy with the same parameters.
     CubicPsResampler(const CubicPsResampler& oOther);
     ~CubicPsResampler() override;
     CubicPsResampler* Clone() const override;
@@ -19,7 +21,9 @@ class VETRA_EXPORT CubicPsResampler : public IRasterResampler {
 /// As `CubicPsResampler`, on the square roots of the samples, with the result squared.
 class VETRA_EXPORT SqCubicPsResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     SqCubicPsResampler();
+    /// A copy with the same parameters.
     SqCubicPsResampler(const SqCubicPsResampler& oOther);
     ~SqCubicPsResampler() override;
     SqCubicPsResampler* Clone() const override;

@@ -10,7 +10,9 @@ namespace vetra::utils {
 /// -0.75 that most programs use.
 class VETRA_EXPORT CubicResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     CubicResampler();
+    /// A copy with the same parameters.
     CubicResampler(const CubicResampler& oOther);
     ~CubicResampler() override;
     CubicResampler* Clone() const override;
@@ -19,7 +21,9 @@ class VETRA_EXPORT CubicResampler : public IRasterResampler {
 /// As `CubicResampler`, on the square roots of the samples, with the result squared.
 class VETRA_EXPORT SqCubicResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     SqCubicResampler();
+    /// A copy with the same parameters.
     SqCubicResampler(const SqCubicResampler& oOther);
     ~SqCubicResampler() override;
     SqCubicResampler* Clone() const override;

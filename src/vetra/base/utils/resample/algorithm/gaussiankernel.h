@@ -5,6 +5,9 @@
 
 #include "vetra/export.h"
 
+/// \file
+/// Weights of Gaussian kernels.
+
 /// Tabulates Gaussian kernels for kernel sampling: 65 phases, phase p for a position p / 64 behind
 /// tap h = (n - 1) / 2 of a kernel of n taps. First the columns' kernels, [65 x nWndNumCols], then
 /// the rows', [65 x nWndNumRows].

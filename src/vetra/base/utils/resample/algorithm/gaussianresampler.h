@@ -26,6 +26,7 @@ class VETRA_EXPORT GaussianResampler : public IRasterResampler {
     /// \param fDsFactorRow  source pixels per target pixel along the rows, 1 to 100000
     /// \throws ParameterException for a factor outside its range, NaN included.
     GaussianResampler(float fDsFactorCol, float fDsFactorRow);
+    /// A copy with the same parameters.
     GaussianResampler(const GaussianResampler& oOther);
     ~GaussianResampler() override;
     GaussianResampler* Clone() const override;
@@ -49,6 +50,7 @@ class VETRA_EXPORT SqGaussianResampler : public IRasterResampler {
     SqGaussianResampler(int nWndNumCols, int nWndNumRows, float fSigmaCol, float fSigmaRow);
     /// As that of `GaussianResampler`.
     SqGaussianResampler(float fDsFactorCol, float fDsFactorRow);
+    /// A copy with the same parameters.
     SqGaussianResampler(const SqGaussianResampler& oOther);
     ~SqGaussianResampler() override;
     SqGaussianResampler* Clone() const override;

@@ -7,18 +7,19 @@
 
 #include "vetra/export.h"
 
-// A kernel file is a table of weights as text. Its first line is the header, two or three integers
-// with commas between them:
-//
-//     KernelSize,NumSubPixels          one kernel for both axes
-//     NumCols,NumRows,NumSubPixels     a kernel for each axis
-//
-// All that follows are the weights, decimal numbers with commas or line ends between them: the
-// kernels of phases 0 to NumSubPixels, each from its first tap to its last, first those of the
-// columns and then, in the second form, those of the rows. That is the layout of
-// `ResampleInfo::mvdfKernelWeights`, where the first form's kernels stand twice. Empty lines, blank
-// ones and those that begin with "#" are passed over, and so are commas with nothing between them.
-// Lines end in "\n" or "\r\n". Numbers don't depend on the process's locale.
+/// \file
+/// A kernel file is a table of weights as text. Its first line is the header, two or three integers
+/// with commas between them:
+///
+///     KernelSize,NumSubPixels          one kernel for both axes
+///     NumCols,NumRows,NumSubPixels     a kernel for each axis
+///
+/// All that follows are the weights, decimal numbers with commas or line ends between them: the
+/// kernels of phases 0 to NumSubPixels, each from its first tap to its last, first those of the
+/// columns and then, in the second form, those of the rows. That is the layout of
+/// `ResampleInfo::mvdfKernelWeights`, where the first form's kernels stand twice. Empty lines,
+/// blank ones and those that begin with "#" are passed over, and so are commas with nothing between
+/// them. Lines end in "\n" or "\r\n". Numbers don't depend on the process's locale.
 
 /// Reads a kernel file. What the numbers mean is for the resampler to check; here only their count
 /// must be right.

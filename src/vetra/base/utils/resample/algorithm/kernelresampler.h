@@ -29,6 +29,7 @@ class VETRA_EXPORT KernelResampler : public IRasterResampler {
     ///         number of weights than (C + R) x (S + 1).
     KernelResampler(int nWndNumCols, int nWndNumRows, int nSubPixels,
                     const std::vector<double>& vdfWeights);
+    /// A copy with the same parameters.
     KernelResampler(const KernelResampler& oOther);
     ~KernelResampler() override;
     KernelResampler* Clone() const override;
@@ -50,6 +51,7 @@ class VETRA_EXPORT SqKernelResampler : public IRasterResampler {
     /// As that of `KernelResampler`.
     SqKernelResampler(int nWndNumCols, int nWndNumRows, int nSubPixels,
                       const std::vector<double>& vdfWeights);
+    /// A copy with the same parameters.
     SqKernelResampler(const SqKernelResampler& oOther);
     ~SqKernelResampler() override;
     SqKernelResampler* Clone() const override;

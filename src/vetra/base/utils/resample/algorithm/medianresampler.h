@@ -14,6 +14,7 @@ class VETRA_EXPORT MedianResampler : public IRasterResampler {
     /// \param nWndNumRows  window rows, at least 1
     /// \throws ParameterException for any other size.
     MedianResampler(int nWndNumCols, int nWndNumRows);
+    /// A copy with the same parameters.
     MedianResampler(const MedianResampler& oOther);
     ~MedianResampler() override;
     MedianResampler* Clone() const override;
@@ -29,6 +30,7 @@ class VETRA_EXPORT SqMedianResampler : public IRasterResampler {
     /// \param nWndNumRows  window rows, at least 1 and at most 11
     /// \throws ParameterException for any other size.
     SqMedianResampler(int nWndNumCols, int nWndNumRows);
+    /// A copy with the same parameters.
     SqMedianResampler(const SqMedianResampler& oOther);
     ~SqMedianResampler() override;
     SqMedianResampler* Clone() const override;

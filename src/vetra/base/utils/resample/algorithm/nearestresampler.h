@@ -9,7 +9,9 @@ namespace vetra::utils {
 /// Nearest sampling: the sample at floor(position + 0.5).
 class VETRA_EXPORT NearestResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     NearestResampler();
+    /// A copy with the same parameters.
     NearestResampler(const NearestResampler& oOther);
     ~NearestResampler() override;
     NearestResampler* Clone() const override;
@@ -18,7 +20,9 @@ class VETRA_EXPORT NearestResampler : public IRasterResampler {
 /// Nearest sampling of squared quantities: as `NearestResampler`, with negative samples as 0.
 class VETRA_EXPORT SqNearestResampler : public IRasterResampler {
  public:
+    /// With the parameters of any new resampler, see `IRasterResampler`.
     SqNearestResampler();
+    /// A copy with the same parameters.
     SqNearestResampler(const SqNearestResampler& oOther);
     ~SqNearestResampler() override;
     SqNearestResampler* Clone() const override;

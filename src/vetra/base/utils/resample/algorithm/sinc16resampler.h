@@ -12,6 +12,7 @@ class VETRA_EXPORT Sinc16Resampler : public IRasterResampler {
  public:
     /// Tabulates the weights; the window isn't needed afterwards.
     explicit Sinc16Resampler(const ShapingWindow& oWindow);
+    /// A copy with the same parameters.
     Sinc16Resampler(const Sinc16Resampler& oOther);
     ~Sinc16Resampler() override;
     Sinc16Resampler* Clone() const override;
@@ -30,6 +31,7 @@ class VETRA_EXPORT SqSinc16Resampler : public IRasterResampler {
  public:
     /// Tabulates the weights; the window isn't needed afterwards.
     explicit SqSinc16Resampler(const ShapingWindow& oWindow);
+    /// A copy with the same parameters.
     SqSinc16Resampler(const SqSinc16Resampler& oOther);
     ~SqSinc16Resampler() override;
     SqSinc16Resampler* Clone() const override;

@@ -12,6 +12,7 @@ class VETRA_EXPORT Sinc8Resampler : public IRasterResampler {
  public:
     /// Tabulates the weights; the window isn't needed afterwards.
     explicit Sinc8Resampler(const ShapingWindow& oWindow);
+    /// A copy with the same parameters.
     Sinc8Resampler(const Sinc8Resampler& oOther);
     ~Sinc8Resampler() override;
     Sinc8Resampler* Clone() const override;
@@ -30,6 +31,7 @@ class VETRA_EXPORT SqSinc8Resampler : public IRasterResampler {
  public:
     /// Tabulates the weights; the window isn't needed afterwards.
     explicit SqSinc8Resampler(const ShapingWindow& oWindow);
+    /// A copy with the same parameters.
     SqSinc8Resampler(const SqSinc8Resampler& oOther);
     ~SqSinc8Resampler() override;
     SqSinc8Resampler* Clone() const override;

@@ -25,6 +25,7 @@ class VETRA_EXPORT BufPosArrayTfm : public IBufPosTfm {
                    int nRowOff, bool bOwner);
     /// Copies the arrays of an object that owns them, else refers to the same arrays.
     BufPosArrayTfm(const BufPosArrayTfm& oOther);
+    /// As the copy constructor. When it throws (std::bad_alloc) the object is as it was.
     BufPosArrayTfm& operator=(const BufPosArrayTfm& oOther);
     ~BufPosArrayTfm() override;
 

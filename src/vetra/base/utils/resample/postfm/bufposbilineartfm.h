@@ -22,7 +22,9 @@ class VETRA_EXPORT BufPosBilinearTfm : public IBufPosTfm {
     /// \throws ParameterException for a size below 1.
     BufPosBilinearTfm(int nNumCols, int nNumRows, double dfCol0, double dfRow0, double dfCol1,
                       double dfRow1, double dfCol2, double dfRow2, double dfCol3, double dfRow3);
+    /// A copy.
     BufPosBilinearTfm(const BufPosBilinearTfm& oOther);
+    /// A copy.
     BufPosBilinearTfm& operator=(const BufPosBilinearTfm& oOther);
     ~BufPosBilinearTfm() override;
 

@@ -7,12 +7,14 @@ namespace vetra::utils {
 
 /// A rectangle of pixels: columns nCol to nCol + nCols - 1, rows likewise.
 struct PixelRect {
-    int nCol = 0;
-    int nRow = 0;
-    int nCols = 0;
-    int nRows = 0;
+    int nCol = 0;   ///< first column
+    int nRow = 0;   ///< first row
+    int nCols = 0;  ///< number of columns
+    int nRows = 0;  ///< number of rows
 
+    /// Columns times rows.
     long long GetNumPix() const { return static_cast<long long>(nCols) * nRows; }
+    /// Whether place and size are equal.
     bool operator==(const PixelRect& oOther) const {
         return nCol == oOther.nCol && nRow == oOther.nRow && nCols == oOther.nCols &&
                nRows == oOther.nRows;
@@ -36,7 +38,9 @@ class VETRA_EXPORT BufPosBlockTfm : public IBufPosTfm {
     /// \param nSrcRow  source row of the first row in memory
     /// \throws ParameterException for a block that is empty or leaves the target.
     BufPosBlockTfm(const IBufPosTfm& oWhole, const PixelRect& oTarget, int nSrcCol, int nSrcRow);
+    /// A copy, which refers to the same whole transform.
     BufPosBlockTfm(const BufPosBlockTfm& oOther);
+    /// A copy, which refers to the same whole transform.
     BufPosBlockTfm& operator=(const BufPosBlockTfm& oOther);
     ~BufPosBlockTfm() override;
 
@@ -46,9 +50,13 @@ class VETRA_EXPORT BufPosBlockTfm : public IBufPosTfm {
     void GetSrcPos(long long nIdx, double& dfCol, double& dfRow) const override;
     BufPosBlockTfm* Clone() const override;
 
+    /// The transform of the whole target.
     const IBufPosTfm& GetWhole() const { return *mpoWhole; }
+    /// The block, in pixels of the whole target.
     const PixelRect& GetTarget() const { return moTarget; }
+    /// Source column of the first column in memory.
     int GetSrcCol() const { return mnSrcCol; }
+    /// Source row of the first row in memory.
     int GetSrcRow() const { return mnSrcRow; }
 
  private:

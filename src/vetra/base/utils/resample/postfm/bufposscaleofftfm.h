@@ -23,7 +23,9 @@ class VETRA_EXPORT BufPosScaleOffTfm : public IBufPosTfm {
     /// \throws ParameterException for a size below 1.
     BufPosScaleOffTfm(int nNumCols, int nNumRows, double dfColScale, double dfColOff,
                       double dfRowScale, double dfRowOff, int nColStart, int nRowStart);
+    /// A copy.
     BufPosScaleOffTfm(const BufPosScaleOffTfm& oOther);
+    /// A copy.
     BufPosScaleOffTfm& operator=(const BufPosScaleOffTfm& oOther);
     ~BufPosScaleOffTfm() override;
 
@@ -33,6 +35,7 @@ class VETRA_EXPORT BufPosScaleOffTfm : public IBufPosTfm {
     void GetSrcPos(long long nIdx, double& dfCol, double& dfRow) const override;
     BufPosScaleOffTfm* Clone() const override;
 
+    /// Hands out what the constructor was given, but for the size.
     void GetTfmParameters(double& dfColScale, double& dfColOff, double& dfRowScale,
                           double& dfRowOff, int& nColStart, int& nRowStart) const;
 

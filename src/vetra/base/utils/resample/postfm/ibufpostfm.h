@@ -16,8 +16,11 @@ namespace vetra::utils {
 /// the const operations keep no scratch state, take no lock, allocate nothing and don't throw.
 class VETRA_EXPORT IBufPosTfm {
  public:
+    /// For derived classes.
     IBufPosTfm() = default;
+    /// For derived classes.
     IBufPosTfm(const IBufPosTfm&) = default;
+    /// For derived classes.
     IBufPosTfm& operator=(const IBufPosTfm&) = default;
     virtual ~IBufPosTfm();
 
