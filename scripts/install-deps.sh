@@ -1,6 +1,6 @@
 #!/usr/bin/env bash
-# Installs the Debian packages of the named groups that are missing: build, tool, tests, packages, roots,
-# demo, guide, bench.
+# Installs the Debian packages of the named groups that are missing: build, tool, tests, docs, packages,
+# roots, demo, guide, bench.
 set -euo pipefail
 
 declare -A groups=(
@@ -9,6 +9,7 @@ declare -A groups=(
     [tests]="clang libclang-rt-dev libomp-dev libgtest-dev libeigen3-dev libgeographiclib-dev pkg-config"
     [packages]="dpkg-dev lintian"
     [roots]="debootstrap"
+    [docs]="doxygen"
     [demo]="gdal-bin proj-data xplanet-images"
     [guide]="gdal-bin"
     [bench]="libbenchmark-dev libopencv-dev libeigen3-dev libfftw3-dev libgeographiclib-dev"

@@ -4,7 +4,7 @@
 set -euo pipefail
 cd "$(dirname "$0")/.."
 
-scripts/install-deps.sh build tool tests
+scripts/install-deps.sh build tool tests docs
 
 for preset in check asan; do
     echo "== $preset"
