@@ -39,6 +39,7 @@ int main() {
     std::vector<unsigned char> vbyOutcome(kHalf * kHalf);
     Resample(oFile, oWhole, oHalve, oResampler.GetResampleInfo(), vbyOutcome.data());
 
+    // [blocks]
     // At most 100 kB for a block's source and target.
     const BlockPlanner oPlanner(oHalve, kSize, kSize, oResampler, 2, 2, 100000);
     ResampleBuffer oTarget(vetra::gobs::eDT_8U, kHalf, kHalf, 1);
@@ -53,6 +54,7 @@ int main() {
                         oTarget.GetBuf() + (oTo.nRow + y) * kHalf + oTo.nCol);
         }
     }
+    // [blocks]
 
     const bool bSame =
         std::equal(oWhole.GetBuf(), oWhole.GetBuf() + kHalf * kHalf, oTarget.GetBuf());

@@ -7,6 +7,7 @@
 #include <cstdio>
 
 int main() {
+    // [camera]
     const double kRadPerDeg = 3.14159265358979 / 180.0;
     const EllipCalc oWgs84;
 
@@ -14,7 +15,9 @@ int main() {
     const double adfCamera[3] = {11.5 * kRadPerDeg, 48.1 * kRadPerDeg, 5000.0};
     double O[3];
     oWgs84.GeoToXYZ(adfCamera[0], adfCamera[1], adfCamera[2], O[0], O[1], O[2]);
+    // [camera]
 
+    // [look]
     // It looks to the north-east, 30 degrees off the vertical: east, north, up.
     const double dfAzimuth = 45.0 * kRadPerDeg;
     const double dfOffNadir = 30.0 * kRadPerDeg;
@@ -22,7 +25,9 @@ int main() {
                                std::sin(dfOffNadir) * std::cos(dfAzimuth), -std::cos(dfOffNadir)};
     double D[3];
     LSRToXYZ(adfLook, adfCamera[0], adfCamera[1], D);
+    // [look]
 
+    // [ground]
     // Where the ray meets the ellipsoid, and terrain at 520 m.
     double P[3];
     double dfRange;
@@ -36,7 +41,9 @@ int main() {
     std::printf("range to 520 m height  %.3f m\n", dfRange);
     std::printf("longitude %.7f, latitude %.7f degrees\n", adfGround[0] / kRadPerDeg,
                 adfGround[1] / kRadPerDeg);
+    // [ground]
 
+    // [back]
     // The same place as the camera sees it: where it is in the local frame.
     EllipCalc oLocal(oWgs84);
     oLocal.SetLsrOrigin(adfCamera[0], adfCamera[1], adfCamera[2]);
@@ -45,5 +52,6 @@ int main() {
     std::printf("east %.3f, north %.3f, up %.3f m\n", e, n, u);
     std::printf("azimuth %.4f, off nadir %.4f degrees\n", GetAzimuth(0.0, 0.0, e, n),
                 std::atan2(std::hypot(e, n), -u) / kRadPerDeg);
+    // [back]
     return 0;
 }
