@@ -35,6 +35,30 @@ std::vector<PairGroup> MakePairGroups(const Task& oTask, const ColumnTables& oCo
     return voGroups;
 }
 
+// Of the windows or nearest pixels that have a class.
+std::vector<BitGroup> MakeBitGroups(const ColumnTables& oColumns,
+                                    const std::vector<std::int64_t>& vnPlace, unsigned char nClass,
+                                    int nCols) {
+    std::vector<BitGroup> voGroups(static_cast<std::size_t>(nCols) / kLanes + 1);
+    const std::int64_t* panPlace = vnPlace.data();
+    const unsigned char* pabyClass = oColumns.vbyClass.data();
+    for (BitGroup& oGroup : voGroups) {
+        const auto [itFirst, itLast] = std::minmax_element(panPlace, panPlace + kLanes);
+        oGroup.nFirst = *itLast - *itFirst < BitGroup::kReach ? *itFirst : -1;
+        for (int i = 0; i < kLanes && oGroup.nFirst >= 0; ++i) {
+            oGroup.anShift[i] =
+                static_cast<std::uint32_t>(BitGroup::kReach - 1 - (panPlace[i] - oGroup.nFirst));
+        }
+        for (int i = 0; i < kLanes; ++i) {
+            const int nBit = (pabyClass[i] & nClass) != 0 ? 1 << i : 0;
+            oGroup.nInside = static_cast<unsigned char>(oGroup.nInside | nBit);
+        }
+        panPlace += kLanes;
+        pabyClass += kLanes;
+    }
+    return voGroups;
+}
+
 }  // namespace
 
 ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
@@ -89,6 +113,10 @@ ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
         }
     }
     oColumns.voGroups = MakePairGroups(oTask, oColumns);
+    if (oTask.pabySrcMask != nullptr) {
+        oColumns.voWholeGroups = MakeBitGroups(oColumns, oColumns.vnWindowCol, kClassFits, nCols);
+        oColumns.voUsableGroups = MakeBitGroups(oColumns, oColumns.vnNearestCol, kClassNear, nCols);
+    }
     return oColumns;
 }
 

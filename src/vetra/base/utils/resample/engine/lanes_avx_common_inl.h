@@ -356,3 +356,32 @@ inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* o) {
 inline F64 DivideBy(F64 x, const Divisor& oDivisor) {
     return FusedMultiplyAdd(x, Set1(oDivisor.dfHigh), x * Set1(oDivisor.dfLow));
 }
+
+// Thirty-two bytes: nByte where a bit is set, else 0.
+inline __m256i SpreadBits(std::uint32_t nBits, unsigned char nByte) {
+    // Each byte gets the eight bits among which its own is, and keeps that one.
+    const __m256i vEight = _mm256_shuffle_epi8(
+        _mm256_set1_epi32(static_cast<int>(nBits)),
+        _mm256_setr_epi64x(0, 0x0101010101010101, 0x0202020202020202, 0x0303030303030303));
+    const __m256i vOwn = _mm256_set1_epi64x(static_cast<long long>(0x8040201008040201u));
+    return _mm256_and_si256(_mm256_cmpeq_epi8(_mm256_and_si256(vEight, vOwn), vOwn),
+                            _mm256_set1_epi8(static_cast<char>(nByte)));
+}
+inline void StoreBits(unsigned char* p, std::uint64_t nBits0, std::uint64_t nBits1) {
+    for (int i = 0; i < 64; i += 32) {
+        _mm256_storeu_si256(
+            reinterpret_cast<__m256i*>(p + i),
+            _mm256_or_si256(SpreadBits(static_cast<std::uint32_t>(nBits0 >> i), 1),
+                            SpreadBits(static_cast<std::uint32_t>(nBits1 >> i), 2)));
+    }
+}
+
+inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
+    std::uint64_t nBits;
+    __builtin_memcpy(&nBits, reinterpret_cast<const char*>(panMap) + oGroup.nFirst / 8,
+                     sizeof nBits);
+    const __m256i v = _mm256_set1_epi32(static_cast<int>(nBits >> (oGroup.nFirst % 8)));
+    const __m256i vShift = _mm256_load_si256(reinterpret_cast<const __m256i*>(oGroup.anShift));
+    return static_cast<unsigned>(
+        _mm256_movemask_ps(_mm256_castsi256_ps(_mm256_sllv_epi32(v, vShift))));
+}

@@ -227,6 +227,24 @@ inline unsigned ByteBits(const unsigned char* p, const std::int64_t* panOffset,
 inline unsigned FullPairBits(const unsigned char* p, const std::int64_t* panOffset) {
     return ~(ByteBits(p, panOffset, 0) | ByteBits(p + 1, panOffset, 0)) & 0xffu;
 }
+inline void StoreBits(unsigned char* p, std::uint64_t nBits0, std::uint64_t nBits1) {
+    for (int i = 0; i < 64; ++i) {
+        p[i] = static_cast<unsigned char>((nBits0 >> i & 1u) | (nBits1 >> i & 1u) << 1);
+    }
+}
+inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
+    const std::uint64_t* p = panMap + oGroup.nFirst / 64;
+    const int nShift = static_cast<int>(oGroup.nFirst % 64);
+    std::uint64_t n = p[0] >> nShift;
+    if (nShift != 0) {
+        n |= p[1] << (64 - nShift);
+    }
+    unsigned nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        nBits |= (static_cast<std::uint32_t>(n) << oGroup.anShift[i]) >> 31 << i;
+    }
+    return nBits;
+}
 inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
     return PickBits(panMap, panPlace);
 }

@@ -41,9 +41,9 @@ MaskMap::MaskMap(const Task& oTask, const LevelStages& oStages)
       mnScratchRows(mnBlockRows + oTask.poMethod->oWindow.nRows - 1),
       mnScratchWords(kBlockWords +
                      (std::int64_t{oTask.poMethod->oWindow.nCols} + kWordBits - 2) / kWordBits) {
-    // Pages that nobody writes to take no memory.
+    // Pages that nobody writes to take no memory. The bits of a group are read as two words.
     mpanBits.reset(static_cast<std::uint64_t*>(std::calloc(
-        static_cast<std::size_t>(2 * mnRowWords * oTask.nSrcRows), sizeof(std::uint64_t))));
+        static_cast<std::size_t>(2 * mnRowWords * oTask.nSrcRows + 1), sizeof(std::uint64_t))));
     const std::int64_t nBlocksDown = (oTask.nSrcRows + mnBlockRows - 1) / mnBlockRows;
     mvbMade.resize(static_cast<std::size_t>(mnBlocksAcross * nBlocksDown));
     mvnScratch.resize(static_cast<std::size_t>(mnScratchRows * mnScratchWords));

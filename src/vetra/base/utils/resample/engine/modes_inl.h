@@ -14,7 +14,12 @@ inline void StoreBits(unsigned char* p, unsigned nBits0, unsigned nBits1) {
 }
 
 inline bool AnyByteEquals(const unsigned char* p, unsigned char nValue) {
-    return Bits(BytesEqual(p, nValue)) != 0;
+    // A byte of 0 alone borrows from its own highest bit.
+    constexpr std::uint64_t nLowest = 0x0101010101010101u;
+    std::uint64_t n;
+    __builtin_memcpy(&n, p, sizeof n);
+    n ^= nValue * nLowest;
+    return ((n - nLowest) & ~n & nLowest << 7) != 0;
 }
 
 // floor(x) <= last is x < last + 1 for whole numbers, which saves the floor.
@@ -143,56 +148,89 @@ inline unsigned UsableBits(const MaskWindow& oWindow, const std::int64_t* panNea
                                : ~ByteBits(oWindow.pabyNearest, panNearest, 0);
 }
 
-// Writes what becomes of groups of eight pixels, and keeps the set of it. Pixels are bits; those of
-// each class have a byte of a word.
-struct ClassWriter {
-    ClassWriter(const MaskWindow& oWindow, int nNumPix) : nPix(nNumPix) {
-        if (oWindow.pabyModeOfClass != nullptr) {
-            __builtin_memcpy(abyWritten, oWindow.pabyModeOfClass, sizeof abyWritten);
+// Bits of eight pixels in a row of bits.
+inline unsigned FindBits(const std::uint64_t* panRow, const BitGroup& oGroup,
+                         const std::int64_t* panPlace) {
+    return oGroup.nFirst >= 0 ? GroupBits(panRow, oGroup) : MapBits(panRow, panPlace);
+}
+
+// Writes classes of pixels, or the modes that belong to them, and keeps the set of what it wrote.
+// Pixels come in groups of eight and are written 64 at a time.
+class ClassWriter {
+ public:
+    // Without modes, classes are written.
+    ClassWriter(const unsigned char* pabyModeOfClass, int nPix, unsigned char* paby)
+        : mnPix(nPix), mpaby(paby) {
+        if (pabyModeOfClass != nullptr) {
+            __builtin_memcpy(mabyWritten, pabyModeOfClass, sizeof mabyWritten);
         }
         for (int k = 0; k < 4; ++k) {
-            const std::uint32_t nByte = 0xffu << (8 * k);
-            nBit0 |= (abyWritten[k] & 1) != 0 ? nByte : 0u;
-            nBit1 |= (abyWritten[k] & 2) != 0 ? nByte : 0u;
+            manBit0[k] = (mabyWritten[k] & 1) != 0 ? ~std::uint64_t{0} : 0;
+            manBit1[k] = (mabyWritten[k] & 2) != 0 ? ~std::uint64_t{0} : 0;
         }
-        bNearestDecides = abyWritten[kClassFits] != abyWritten[kClassFits | kClassNear];
     }
 
-    void Write(int i, std::uint32_t nFits, std::uint32_t nNear, unsigned char* p) {
-        nFits &= 0xffu;
-        nNear &= 0xffu;
-        const std::uint32_t nBoth = nFits & nNear;
-        const std::uint32_t nClasses =
-            ((nFits | nNear) ^ 0xffu) | (nFits ^ nBoth) << 8 | (nNear ^ nBoth) << 16 | nBoth << 24;
-        const auto fnFold = [](std::uint32_t n) {
-            n |= n >> 16;
-            return (n | n >> 8) & 0xffu;
-        };
-        StoreBits(p + i, fnFold(nClasses & nBit0), fnFold(nClasses & nBit1));
-        const std::uint32_t nExist = nPix - i < kLanes ? (1u << (nPix - i)) - 1u : 0xffu;
-        nFound |= nClasses & nExist * 0x01010101u;
+    // Whether the nearest pixel decides about those whose windows are whole.
+    bool NearestDecides() const {
+        return mabyWritten[kClassFits] != mabyWritten[kClassFits | kClassNear];
     }
 
+    // Adds the pixels i to i + 7.
+    void Add(int i, unsigned nFits, unsigned nNear) {
+        const int nShift = i % kWord;
+        mnFits |= std::uint64_t{nFits & 0xffu} << nShift;
+        mnNear |= std::uint64_t{nNear & 0xffu} << nShift;
+        if (nShift == kWord - kLanes || i + kLanes >= mnPix) {
+            Write(i - nShift);
+        }
+    }
+
+    // Of all pixels, when they have been added.
     unsigned GetSet() const {
         unsigned nSet = 0;
         for (int k = 0; k < 4; ++k) {
-            nSet |= (nFound >> (8 * k) & 0xffu) != 0 ? 1u << abyWritten[k] : 0u;
+            nSet |= manFound[k] != 0 ? 1u << mabyWritten[k] : 0u;
         }
         return nSet;
     }
 
-    int nPix;
-    unsigned char abyWritten[4] = {0, 1, 2, 3};
-    std::uint32_t nBit0 = 0;  // the classes for which bit 0 is written
-    std::uint32_t nBit1 = 0;
-    std::uint32_t nFound = 0;
-    bool bNearestDecides;  // about pixels whose windows are whole
+ private:
+    static constexpr int kWord = 64;
+
+    void Write(int i) {
+        const std::uint64_t nBoth = mnFits & mnNear;
+        const std::uint64_t anClass[4] = {~(mnFits | mnNear), mnFits ^ nBoth, mnNear ^ nBoth,
+                                          nBoth};
+        const int nRest = mnPix - i;
+        const std::uint64_t nExist =
+            nRest < kWord ? (std::uint64_t{1} << nRest) - 1 : ~std::uint64_t{0};
+        std::uint64_t nBits0 = 0;
+        std::uint64_t nBits1 = 0;
+        for (int k = 0; k < 4; ++k) {
+            nBits0 |= anClass[k] & manBit0[k];
+            nBits1 |= anClass[k] & manBit1[k];
+            manFound[k] |= anClass[k] & nExist;
+        }
+        StoreBits(mpaby + i, nBits0, nBits1);
+        mnFits = 0;
+        mnNear = 0;
+    }
+
+    int mnPix;
+    unsigned char* mpaby;
+    unsigned char mabyWritten[4] = {0, 1, 2, 3};
+    // All bits set for the classes for which bit 0, or bit 1, is written.
+    std::uint64_t manBit0[4];
+    std::uint64_t manBit1[4];
+    std::uint64_t manFound[4] = {};
+    std::uint64_t mnFits = 0;
+    std::uint64_t mnNear = 0;
 };
 
 VETRA_STAGE unsigned MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
                                  const std::int64_t* panNearest, int nPix,
                                  unsigned char* pabyClassThenMode) {
-    ClassWriter oWriter(oWindow, nPix);
+    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, pabyClassThenMode);
     for (int i = 0; i < nPix; i += kLanes) {
         const unsigned char* pabyGroup = pabyClassThenMode + i;
         const unsigned nBoth = Bits(BytesEqual(pabyGroup, kClassFits | kClassNear));
@@ -202,10 +240,29 @@ VETRA_STAGE unsigned MaskClasses(const MaskWindow& oWindow, const std::int64_t* 
         if (oWindow.nWndRows != 0 && nFits != 0) {
             nFits &= WholeBits(oWindow, panWindow + i);
         }
-        if (nFits != 0xff || oWriter.bNearestDecides) {
+        if (nFits != 0xff || oWriter.NearestDecides()) {
             nNear &= UsableBits(oWindow, panNearest + i);
         }
-        oWriter.Write(i, nFits, nNear, pabyClassThenMode);
+        oWriter.Add(i, nFits, nNear);
+    }
+    return oWriter.GetSet();
+}
+
+VETRA_STAGE unsigned RowClasses(const MaskWindow& oWindow, unsigned char nRowClass,
+                                const std::int64_t* panWindow, const std::int64_t* panNearest,
+                                int nPix, unsigned char* pabyClassThenMode) {
+    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, pabyClassThenMode);
+    const unsigned nRowFits = (nRowClass & kClassFits) != 0 ? 0xff : 0;
+    const unsigned nRowNear = (nRowClass & kClassNear) != 0 ? 0xff : 0;
+    const unsigned nUncounted = oWindow.nWndRows != 0 ? 0 : 0xff;
+    for (int i = 0; i < nPix; i += kLanes) {
+        const BitGroup& oWhole = oWindow.poWholeGroups[i / kLanes];
+        const BitGroup& oUsable = oWindow.poUsableGroups[i / kLanes];
+        oWriter.Add(
+            i,
+            oWhole.nInside & nRowFits &
+                (nUncounted | FindBits(oWindow.panWhole, oWhole, panWindow + i)),
+            oUsable.nInside & nRowNear & FindBits(oWindow.panUsable, oUsable, panNearest + i));
     }
     return oWriter.GetSet();
 }
@@ -215,7 +272,7 @@ VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWin
                                   const double* padfCol, const double* padfRow, int nPix,
                                   const SpanPlaces& oPlaces) {
     const Limits oLimits(oClassLimits);
-    ClassWriter oWriter(oWindow, nPix);
+    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, oPlaces.pabyClassThenMode);
     const double dfBitPitch = static_cast<double>(nBitPitch);
     const F64 bitPitch = Set1(dfBitPitch);
     const F64 pitch = Set1(dfPitch);
@@ -225,9 +282,9 @@ VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWin
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
-        const B64 fit = oLimits.Fit(col, row);
-        unsigned nFits = Bits(fit);
-        if (nFits != 0) {
+        unsigned nFits = 0;
+        if (oPlaces.panWindow != nullptr) {
+            const B64 fit = oLimits.Fit(col, row);
             const F64 anchorCol = Anchor(oClassLimits, col);
             const F64 anchorRow = Anchor(oClassLimits, row);
             StorePlaces(oPlaces.panWindow + i, fit, anchorRow * pitch + anchorCol * chan + first);
@@ -236,20 +293,16 @@ VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWin
             const unsigned nWhole =
                 MapBits(oWindow.panWhole,
                         Select(fit, anchorRow * bitPitch + anchorCol + firstBit, Set1(0.0)));
+            nFits = Bits(fit);
             if (oPlaces.pabyBroken != nullptr) {
-                StoreBits(oPlaces.pabyBroken + i, nFits & ~nWhole, 0);
+                StoreBits(oPlaces.pabyBroken + i, nFits & ~nWhole, 0u);
             }
             if (oWindow.nWndRows != 0) {
                 nFits &= nWhole;
             }
-        } else {
-            StoreIntegers(oPlaces.panWindow + i, Set1(0.0));
-            if (oPlaces.pabyBroken != nullptr) {
-                StoreBits(oPlaces.pabyBroken + i, 0, 0);
-            }
         }
         unsigned nNear = 0;
-        if (nFits != 0xff || oWriter.bNearestDecides) {
+        if (nFits != 0xff || oWriter.NearestDecides()) {
             const B64 near = oLimits.Near(col, row);
             const F64 nearCol = Nearest(col);
             const F64 nearRow = Nearest(row);
@@ -257,7 +310,7 @@ VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWin
             nNear = Bits(near) & MapBits(oWindow.panUsable,
                                          Select(near, nearRow * bitPitch + nearCol, Set1(0.0)));
         }
-        oWriter.Write(i, nFits, nNear, oPlaces.pabyClassThenMode);
+        oWriter.Add(i, nFits, nNear);
     }
     return oWriter.GetSet();
 }
@@ -276,11 +329,17 @@ VETRA_STAGE void MaskBits(const unsigned char* pabyMask, std::int64_t nCount, un
     }
 }
 
-VETRA_STAGE void BrokenWindows(const std::uint64_t* panWhole, const std::int64_t* panWindow,
+VETRA_STAGE void BrokenWindows(const MaskWindow& oWindow, const std::int64_t* panWindow,
                                const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken) {
     for (int i = 0; i < nPix; i += kLanes) {
-        const unsigned nMode = Bits(BytesEqual(pabyMode + i, 1));
-        StoreBits(pabyBroken + i, nMode != 0 ? nMode & ~MapBits(panWhole, panWindow + i) : 0u, 0);
+        unsigned nBroken = Bits(BytesEqual(pabyMode + i, 1));
+        if (nBroken != 0) {
+            nBroken &=
+                ~(oWindow.poWholeGroups != nullptr
+                      ? FindBits(oWindow.panWhole, oWindow.poWholeGroups[i / kLanes], panWindow + i)
+                      : MapBits(oWindow.panWhole, panWindow + i));
+        }
+        StoreBits(pabyBroken + i, nBroken, 0u);
     }
 }
 
@@ -288,23 +347,15 @@ VETRA_STAGE unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow,
                                unsigned char nFallback, const double* padfCol,
                                const double* padfRow, int nPix, unsigned char* pabyMode) {
     const Limits oLimits(oClassLimits);
-    unsigned nFitAny = 0;
-    unsigned nNearAny = 0;
-    unsigned nNoneAny = 0;
+    const unsigned char abyModeOfClass[4] = {0, 1, nFallback, 1};
+    ClassWriter oWriter(abyModeOfClass, nPix, pabyMode);
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
         const unsigned nFit = bWindow ? Bits(oLimits.Fit(col, row)) : 0u;
-        unsigned nNear = 0;
-        if (nFit != 0xffu && nFallback != 0) {
-            nNear = Bits(oLimits.Near(col, row)) & ~nFit;
-        }
-        StoreBits(pabyMode + i, nFit, nNear);
-        nFitAny |= nFit;
-        nNearAny |= nNear;
-        nNoneAny |= ~(nFit | nNear) & 0xffu;
+        oWriter.Add(i, nFit, nFit == 0xffu ? 0u : Bits(oLimits.Near(col, row)));
     }
-    return (nNoneAny != 0 ? 1u : 0u) | (nFitAny != 0 ? 2u : 0u) | (nNearAny != 0 ? 4u : 0u);
+    return oWriter.GetSet();
 }
 
 VETRA_STAGE void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan,

@@ -96,6 +96,8 @@ MaskWindow Run::GetMaskWindow(const MaskView& oMask) const {
     const bool bWholeWindow = moMethod.eRule == ModeRule::eWindow;
     return {oMask.panWhole,
             oMask.panUsable,
+            oMask.poWholeGroups,
+            oMask.poUsableGroups,
             oMask.pabyWindow,
             oMask.pabyNearest,
             moTask.nSrcCols,

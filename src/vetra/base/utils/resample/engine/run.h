@@ -120,6 +120,8 @@ class Run {
     struct MaskView {
         const std::uint64_t* panWhole;
         const std::uint64_t* panUsable;
+        const BitGroup* poWholeGroups;
+        const BitGroup* poUsableGroups;
         const unsigned char* pabyWindow;
         const unsigned char* pabyNearest;
     };
@@ -139,7 +141,7 @@ class Run {
     template <typename Function>
     void WithSampleBits(const Function& fnDo) const;
     template <typename Bits>
-    void AddBackground(const Span& oSpan, unsigned char* pabySample) const;
+    void AddBackground(const Span& oSpan, void* pSamples) const;
     void CopyRuns(const Span& oSpan) const;
     void Copy(const Span& oSpan, int nBegin, int nEnd) const;
     void FillBackground(long long nFirst, int nPix) const;

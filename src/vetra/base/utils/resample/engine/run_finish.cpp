@@ -151,13 +151,17 @@ void Run::WithSampleBits(const Function& fnDo) const {
 }
 
 template <typename Bits>
-void Run::AddBackground(const Span& oSpan, unsigned char* pabySample) const {
+void Run::AddBackground(const Span& oSpan, void* pSamples) const {
     Bits background;
     std::memcpy(&background, moTask.pBackground, sizeof background);
-    for (std::size_t i = 0; i < static_cast<std::size_t>(oSpan.nPix); ++i) {
+    // Copies that no store can reach.
+    const unsigned char* __restrict pabyMode = oSpan.pabyMode;
+    auto* __restrict pabySample = static_cast<unsigned char*>(pSamples);
+    const auto nPix = static_cast<std::size_t>(oSpan.nPix);
+    for (std::size_t i = 0; i < nPix; ++i) {
         Bits sample;
         std::memcpy(&sample, pabySample + i * sizeof(Bits), sizeof sample);
-        sample = oSpan.pabyMode[i] == ePO_BACKGROUND ? background : sample;
+        sample = pabyMode[i] == ePO_BACKGROUND ? background : sample;
         std::memcpy(pabySample + i * sizeof(Bits), &sample, sizeof sample);
     }
 }
@@ -198,6 +202,11 @@ void Run::CopyRuns(const Span& oSpan) const {
         // Pixels of other modes have places too.
         Copy(oSpan, 0, oSpan.nPix);
         if ((oSpan.nModes & kSetBackground) == 0) {
+            return;
+        }
+        if (moTask.nChan == 1) {
+            WithSampleBits(
+                [&](auto nBits) { AddBackground<decltype(nBits)>(oSpan, TgtPixel(oSpan.nFirst)); });
             return;
         }
         for (int nBegin = 0; nBegin < oSpan.nPix;) {

@@ -51,9 +51,10 @@ void Run::Place(SpanArrays& oArrays) const {
     } else {
         moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
                             oArrays.abyMode, oArrays.anWindow, oArrays.anNearest);
-        oSpan.nModes = ChooseModes(oSpan.nFirst, nPix,
-                                   {nullptr, nullptr, moTask.pabySrcMask, moTask.pabySrcMask},
-                                   oArrays.anWindow, oArrays.anNearest, oArrays.abyMode);
+        oSpan.nModes = ChooseModes(
+            oSpan.nFirst, nPix,
+            {nullptr, nullptr, nullptr, nullptr, moTask.pabySrcMask, moTask.pabySrcMask},
+            oArrays.anWindow, oArrays.anNearest, oArrays.abyMode);
     }
     if ((oSpan.nModes & kSetInterpolated) != 0) {
         moStages.pfnWindows(moLimits, static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
@@ -77,8 +78,9 @@ void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
     oSpan.nModes = moStages.pfnMappedPlaces(
         moLimits, GetMaskWindow(oMask), oMap.GetPitch(), static_cast<double>(mnPitch), moTask.nChan,
         oArrays.adfCol, oArrays.adfRow, oSpan.nPix,
-        {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr, oArrays.anWindow,
-         oArrays.anNearest, oArrays.adfFracCol, oArrays.adfFracRow});
+        {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr,
+         moMethod.eValues != eVR_NONE ? oArrays.anWindow : nullptr, oArrays.anNearest,
+         oArrays.adfFracCol, oArrays.adfFracRow});
     oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, oSpan.nModes, oArrays.abyMode);
     if (bReplacing) {
         oSpan.eValues = PlainRow(moMethod);

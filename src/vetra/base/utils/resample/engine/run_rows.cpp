@@ -92,16 +92,28 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
             oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
         } else {
-            const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
-            for (int i = 0; i < kSpanPixels; ++i) {
-                abyMode[i] = pabyClass[i] & nRowClass;
-            }
+            const bool bGroups = oMask.panWhole != nullptr && nCol % kLanes == 0;
+            oMask.poWholeGroups =
+                bGroups ? moColumns.voWholeGroups.data() + nCol / kLanes : nullptr;
+            oMask.poUsableGroups =
+                bGroups ? moColumns.voUsableGroups.data() + nCol / kLanes : nullptr;
             const std::int64_t* panWindow = moColumns.vnWindowCol.data() + nCol;
-            oSpan.nModes = ChooseModes(oSpan.nFirst, oSpan.nPix, oMask, panWindow,
-                                       moColumns.vnNearestCol.data() + nCol, abyMode);
+            const std::int64_t* panNearest = moColumns.vnNearestCol.data() + nCol;
+            if (bGroups) {
+                const unsigned nModes = moStages.pfnRowClasses(
+                    GetMaskWindow(oMask), nRowClass, panWindow, panNearest, oSpan.nPix, abyMode);
+                oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, nModes, abyMode);
+            } else {
+                const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
+                for (int i = 0; i < kSpanPixels; ++i) {
+                    abyMode[i] = pabyClass[i] & nRowClass;
+                }
+                oSpan.nModes =
+                    ChooseModes(oSpan.nFirst, oSpan.nPix, oMask, panWindow, panNearest, abyMode);
+            }
             oSpan.pabyMode = abyMode;
             if (bReplacing && oMask.panWhole != nullptr) {
-                moStages.pfnBrokenWindows(oMask.panWhole, panWindow, abyMode, oSpan.nPix,
+                moStages.pfnBrokenWindows(GetMaskWindow(oMask), panWindow, abyMode, oSpan.nPix,
                                           abyBroken);
                 oSpan.eValues = PlainRow(moMethod);
                 oSpan.pabyBroken = abyBroken;

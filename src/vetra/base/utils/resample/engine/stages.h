@@ -50,12 +50,28 @@ struct PositionBounds {
     double dfLastRow;
 };
 
+/// Where the windows, or the nearest pixels, of eight neighbouring target columns find their bits
+/// in a row of bits.
+struct BitGroup {
+    static constexpr int kReach = 32;
+    /// By how much 32 bits from nFirst on are to be shifted left to bring a column's bit to the
+    /// top.
+    alignas(kReach) std::uint32_t anShift[kLanes];
+    /// Below 0 where 32 bits don't hold all.
+    std::int64_t nFirst;
+    /// A bit for each column that is inside the source.
+    unsigned char nInside;
+};
+
 /// The source mask, as a run's windows see it.
 struct MaskWindow {
     /// A bit for each window, set where it is whole, and one for each nearest pixel, set where it
     /// may be used; or null, and the bytes are looked at.
     const std::uint64_t* panWhole;
     const std::uint64_t* panUsable;
+    /// Of each eight windows, and nearest pixels, where all lie in one row of bits; or null.
+    const BitGroup* poWholeGroups;
+    const BitGroup* poUsableGroups;
     const unsigned char* pabyWindow;
     const unsigned char* pabyNearest;
     int nSrcCols;
@@ -72,6 +88,7 @@ struct SpanPlaces {
     unsigned char* pabyClassThenMode;
     /// 1 for pixels whose windows fit but aren't whole, else 0. May be null.
     unsigned char* pabyBroken;
+    /// Null for a method without windows.
     std::int64_t* panWindow;
     std::int64_t* panNearest;
     double* padfFracCol;
@@ -291,6 +308,11 @@ struct LevelStages {
     unsigned (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
                                const std::int64_t* panNearest, int nPix,
                                unsigned char* pabyClassThenMode);
+    /// The same where all windows lie in one row of bits, and all nearest pixels: classes or modes,
+    /// from the class of the target row.
+    unsigned (*pfnRowClasses)(const MaskWindow& oWindow, unsigned char nRowClass,
+                              const std::int64_t* panWindow, const std::int64_t* panNearest,
+                              int nPix, unsigned char* pabyClassThenMode);
     /// Bits of nCount mask bytes, set where they are nValue (bEqual) or aren't; and zeros up to a
     /// whole word.
     void (*pfnMaskBits)(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
@@ -304,7 +326,7 @@ struct LevelStages {
                                 const double* padfCol, const double* padfRow, int nPix,
                                 const SpanPlaces& oPlaces);
     /// Writes 1 for those of nPix pixels whose mode is 1 and whose windows aren't whole, else 0.
-    void (*pfnBrokenWindows)(const std::uint64_t* panWhole, const std::int64_t* panWindow,
+    void (*pfnBrokenWindows)(const MaskWindow& oWindow, const std::int64_t* panWindow,
                              const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set

@@ -20,6 +20,8 @@
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
 //   MapBits                      bits: which of eight numbers a map of bits has
+//   GroupBits                    bits: the same where a BitGroup says where they are
+//   StoreBits                    64 bytes: bit 0 of each from one word, bit 1 from another
 //   EqualBits                    bits: which of 64 bytes have a value
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
@@ -125,6 +127,7 @@ const LevelStages kStages = {
     &BilinearPositions,
     &Classes,
     &MaskClasses,
+    &RowClasses,
     &MaskBits,
     &Bounds,
     &MappedPlaces,
