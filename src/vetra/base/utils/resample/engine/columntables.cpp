@@ -46,8 +46,8 @@ std::vector<BitGroup> MakeBitGroups(const ColumnTables& oColumns,
         const auto [itFirst, itLast] = std::minmax_element(panPlace, panPlace + kLanes);
         oGroup.nFirst = *itLast - *itFirst < BitGroup::kReach ? *itFirst : -1;
         for (int i = 0; i < kLanes && oGroup.nFirst >= 0; ++i) {
-            oGroup.anShift[i] =
-                static_cast<std::uint32_t>(BitGroup::kReach - 1 - (panPlace[i] - oGroup.nFirst));
+            oGroup.abyShift[i] =
+                static_cast<unsigned char>(BitGroup::kReach - 1 - (panPlace[i] - oGroup.nFirst));
         }
         for (int i = 0; i < kLanes; ++i) {
             const int nBit = (pabyClass[i] & nClass) != 0 ? 1 << i : 0;
@@ -63,7 +63,7 @@ std::vector<BitGroup> MakeBitGroups(const ColumnTables& oColumns,
 
 ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
                               const Positions& oPositions, const ClassLimits& oLimits,
-                              const ModeTable& oModes) {
+                              const ModeTable* poModes) {
     const int nCols = oTask.nTgtCols;
     const std::size_t nSize = static_cast<std::size_t>(nCols) + kSpanArray;
     ColumnTables oColumns;
@@ -99,17 +99,24 @@ ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
             oColumns.oReach.Add(oColumns.vnNearestCol[i]);
         }
     }
-    oColumns.vnWindow = oColumns.vnWindowCol;
-    oColumns.vnNearest = oColumns.vnNearestCol;
-    for (std::size_t i = 0; i < nSize; ++i) {
-        oColumns.vnWindow[i] *= oTask.nChan;
-        oColumns.vnNearest[i] *= oTask.nChan;
-    }
-    for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
-        auto& vbyMode = oColumns.avbyMode[nRowClass];
-        vbyMode.resize(nSize);
-        for (std::size_t i = 0; i < nSize; ++i) {
-            vbyMode[i] = oModes.Get(ePO_INTERPOLATED, oColumns.vbyClass[i] & nRowClass);
+    const auto fnOffsets = [&](const std::vector<std::int64_t>& vnCol) {
+        std::vector<std::int64_t> vnOffset(nSize);
+        std::transform(vnCol.begin(), vnCol.begin() + nCols, vnOffset.begin(),
+                       [&](std::int64_t n) { return n * oTask.nChan; });
+        return vnOffset;
+    };
+    oColumns.vnWindow = fnOffsets(oColumns.vnWindowCol);
+    oColumns.vnNearest = fnOffsets(oColumns.vnNearestCol);
+    if (poModes != nullptr) {
+        for (unsigned char nRowClass = 0; nRowClass < 4; ++nRowClass) {
+            unsigned char abyMode[4];
+            for (unsigned char nClass = 0; nClass < 4; ++nClass) {
+                abyMode[nClass] = poModes->Get(ePO_INTERPOLATED, nClass & nRowClass);
+            }
+            std::vector<unsigned char>& vbyMode = oColumns.avbyMode[nRowClass];
+            vbyMode.resize(nSize);
+            std::transform(oColumns.vbyClass.begin(), oColumns.vbyClass.begin() + nCols,
+                           vbyMode.begin(), [&](unsigned char nClass) { return abyMode[nClass]; });
         }
     }
     oColumns.voGroups = MakePairGroups(oTask, oColumns);

@@ -34,7 +34,7 @@ struct ColumnTables {
     std::vector<unsigned char> vbyClass;
     // Of the windows that fit, where they begin, and of the nearest pixels that are inside.
     Reach oReach;
-    // Modes by the class of the row, where no mask has a say.
+    // Modes by the class of the row, if those are asked for.
     std::vector<unsigned char> avbyMode[4];
     // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
     std::vector<PairGroup> voGroups;
@@ -43,10 +43,10 @@ struct ColumnTables {
     std::vector<BitGroup> voUsableGroups;
 };
 
-/// Throws std::bad_alloc.
+/// Modes are tabulated where poModes isn't null. Throws std::bad_alloc.
 ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
                               const Positions& oPositions, const ClassLimits& oLimits,
-                              const ModeTable& oModes);
+                              const ModeTable* poModes);
 
 }  // namespace vetra::utils::engine
 

@@ -381,7 +381,8 @@ inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
     __builtin_memcpy(&nBits, reinterpret_cast<const char*>(panMap) + oGroup.nFirst / 8,
                      sizeof nBits);
     const __m256i v = _mm256_set1_epi32(static_cast<int>(nBits >> (oGroup.nFirst % 8)));
-    const __m256i vShift = _mm256_load_si256(reinterpret_cast<const __m256i*>(oGroup.anShift));
+    const __m256i vShift =
+        _mm256_cvtepu8_epi32(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(oGroup.abyShift)));
     return static_cast<unsigned>(
         _mm256_movemask_ps(_mm256_castsi256_ps(_mm256_sllv_epi32(v, vShift))));
 }

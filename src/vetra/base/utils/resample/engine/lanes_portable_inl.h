@@ -241,7 +241,7 @@ inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
     }
     unsigned nBits = 0;
     for (int i = 0; i < kLanes; ++i) {
-        nBits |= (static_cast<std::uint32_t>(n) << oGroup.anShift[i]) >> 31 << i;
+        nBits |= (static_cast<std::uint32_t>(n) << oGroup.abyShift[i]) >> 31 << i;
     }
     return nBits;
 }

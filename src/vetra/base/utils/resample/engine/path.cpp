@@ -27,11 +27,11 @@ PathChoice ChooseByMethod(const Task& oTask, const PathFacts& oFacts) {
     if (oFacts.poRows == nullptr || oFacts.poRows->pfnValues == nullptr) {
         return {Path::eColumns, "the method doesn't work on rows"};
     }
-    if (oFacts.bReduces) {
-        return {Path::eColumns, "rows would hold mostly samples that nobody reads"};
-    }
     if (oMethod.eValues == eVR_BILINEAR) {
         return {Path::eColumns, "four samples are read sooner from the source than from rows"};
+    }
+    if (oFacts.bReduces) {
+        return {Path::eColumns, "rows would hold mostly samples that nobody reads"};
     }
     if (oMethod.eValues == eVR_AVERAGE && SumsAreExact(oTask, oFacts)) {
         return {Path::eSums, "sums of integers are exact in any order"};

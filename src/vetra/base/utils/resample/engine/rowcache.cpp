@@ -36,6 +36,11 @@ RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTabl
     moFacts.pfnMedians =
         (mbSquared ? oStages.apfnSquaredMedians : oStages.apfnMedians)[oTask.nSrcType];
     mpadfFracCol = oColumns.vdfFrac.data();
+    // Strips are made for nothing where no rows are kept however they lie.
+    moPath = ChoosePath(oTask, moFacts);
+    if (!KeepsRows(moPath.ePath)) {
+        return;
+    }
     // As wide as the cache allows.
     for (int nCols = kWidestStrip; nCols >= kSpanPixels; nCols /= 2) {
         MakeStrips(oTask, oColumns, nCols);

@@ -65,7 +65,8 @@ Run::Run(const Task& oTask)
         // Tables of a single row would be made for nothing, and those of very wide ones are large.
         if (oTask.nTgtRows > 1 && oTask.nTgtCols <= kMostTabulatedCols &&
             moPositions.IsAxisAligned(oTask.nTgtCols)) {
-            moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits, moModes);
+            moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits,
+                                         mbOpen ? &moModes : nullptr);
             moRowPlan = RowPlan(oTask, moStages, moColumns);
         }
     }

@@ -61,21 +61,21 @@ struct SpanArrays {
     alignas(64) unsigned char abyBroken[kSpanArray] = {};
 };
 
-// The windows of some pixels of a span, packed.
+// The windows of some pixels of a span, packed; in whole groups, nothing behind which is looked at.
 struct PackedWindows {
-    int nPix = 0;
-    int anPixel[kSpanArray] = {};
-    alignas(64) std::int64_t anOffset[kSpanArray] = {};
-    alignas(64) double adfFracCol[kSpanArray] = {};
-    alignas(64) double adfFracRow[kSpanArray] = {};
-    alignas(64) double adfValue[kSpanArray] = {};
+    int nPix;
+    int anPixel[kSpanArray];
+    alignas(64) std::int64_t anOffset[kSpanArray];
+    alignas(64) double adfFracCol[kSpanArray];
+    alignas(64) double adfFracRow[kSpanArray];
+    alignas(64) double adfValue[kSpanArray];
 };
 
 // Values of the channels of a span that are made at once, and the samples that are written at once.
 struct ValueArrays {
     // As many as the values stage may fill at once.
     alignas(64) double adfValue[kMostChannelsAtOnce * kSpanArray] = {};
-    alignas(64) unsigned char abySample[kMostChannelsAtOnce * kSpanArray * sizeof(double)] = {};
+    alignas(64) unsigned char abySample[kMostChannelsAtOnce * kSpanArray * sizeof(double)];
     PackedWindows oBroken;
 };
 unsigned SetOfModes(const unsigned char* pabyMode, int nPix);

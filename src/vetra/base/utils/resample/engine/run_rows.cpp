@@ -49,8 +49,10 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
 
     Span oSpan;
     double adfFracRow[kSpanArray];
-    std::fill_n(adfFracRow, std::min(nNumCols, kSpanPixels) + kLanes, dfFracRow);
-    oSpan.padfFracRow = adfFracRow;
+    if (moMethod.eValues != eVR_NONE) {
+        std::fill_n(adfFracRow, std::min(nNumCols, kSpanPixels) + kLanes, dfFracRow);
+        oSpan.padfFracRow = adfFracRow;
+    }
     oSpan.eValues = moMethod.eValues;
     // Rows outside have no samples: no pixel of theirs has a mode that reads any.
     const long long nWindowRow =

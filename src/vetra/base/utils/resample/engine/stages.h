@@ -56,7 +56,7 @@ struct BitGroup {
     static constexpr int kReach = 32;
     /// By how much 32 bits from nFirst on are to be shifted left to bring a column's bit to the
     /// top.
-    alignas(kReach) std::uint32_t anShift[kLanes];
+    unsigned char abyShift[kLanes];
     /// Below 0 where 32 bits don't hold all.
     std::int64_t nFirst;
     /// A bit for each column that is inside the source.
