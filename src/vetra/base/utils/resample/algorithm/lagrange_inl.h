@@ -71,14 +71,19 @@ struct Lagrange8Filter {
             distance[k] = u - Set1(k);
         }
         // Each is the product of the distances to the other nodes, in ascending order.
-        F64 below = distance[0];
-        for (int k = 0; k < kTaps; ++k) {
-            product[k] = k == 0 ? distance[1] : below;
-            for (int j = k == 0 ? 2 : k + 1; j < kTaps; ++j) {
-                product[k] = product[k] * distance[j];
-            }
-            below = k == 0 ? below : below * distance[k];
-        }
+        product[0] = Times<2>(distance[1], distance);
+        product[1] = Times<2>(distance[0], distance);
+        F64 below = distance[0] * distance[1];
+        product[2] = Times<3>(below, distance);
+        below = below * distance[2];
+        product[3] = Times<4>(below, distance);
+        below = below * distance[3];
+        product[4] = Times<5>(below, distance);
+        below = below * distance[4];
+        product[5] = Times<6>(below, distance);
+        below = below * distance[5];
+        product[6] = Times<7>(below, distance);
+        product[7] = below * distance[6];
     }
 
     template <typename Samples>
@@ -97,6 +102,17 @@ struct Lagrange8Filter {
         const F64 value =
             term[1] - term[0] - term[2] + term[3] - term[4] + term[5] - term[6] + term[7];
         return Select(onNode, node, value);
+    }
+
+    // x times the distances to node kFirst and those behind it. Compilers don't unroll the loop, and
+    // what goes through memory is slow.
+    template <int kFirst>
+    static F64 Times(F64 x, const F64 (&distance)[kTaps]) {
+        if constexpr (kFirst < kTaps) {
+            return Times<kFirst + 1>(x * distance[kFirst], distance);
+        } else {
+            return x;
+        }
     }
 
     B64 onNode;
