@@ -49,6 +49,7 @@
 #include "vetra/base/utils/resample/postfm/bufposarraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposbilineartfm.h"
 #include "vetra/base/utils/resample/postfm/bufposblocktfm.h"
+#include "vetra/base/utils/resample/postfm/bufposdoublearraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 #include "vetra/base/utils/resample/postfm/ibufpostfm.h"
 #include "vetra/base/utils/resample/resample.h"

@@ -51,6 +51,8 @@ int main() {
     // What else a consumer links.
     float afPos[] = {0.0f};
     const BufPosArrayTfm oArray(1, 1, afPos, 0, afPos, 0, false);
+    const double dfPos = 0.0;
+    const BufPosDoubleArrayTfm oDoubleArray(1, 1, &dfPos, &dfPos);
     const BufPosBilinearTfm oBilinear(1, 1, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0, 0.0);
     const ShapingWindow oWindow = GetShapingWindow(ResampleInfo());
     const std::unique_ptr<IRasterResampler> apoResamplers[] = {

@@ -41,6 +41,20 @@ TEST(BufPosTfm, Array) {
     ExpectPos(BufPosArrayTfm(2, 1, gafCols, 1, gafRows, 0, false), 1, 16777217.0, 1.0);
 }
 
+TEST(BufPosTfm, DoubleArray) {
+    // A position that a float would move by a pixel.
+    const double adfCols[] = {16777217.25, NAN, -0.1};
+    const double adfRows[] = {1e9 + 0.125, 2.0, INFINITY};
+    const BufPosDoubleArrayTfm oTfm(3, 1, adfCols, adfRows);
+    BufPosDoubleArrayTfm oCopy(1, 1, adfRows, adfCols);
+    oCopy = *std::unique_ptr<BufPosDoubleArrayTfm>(oTfm.Clone());
+    EXPECT_EQ(oCopy.GetNumPix(), 3);
+    for (int i = 0; i < 3; ++i) {
+        ExpectPos(oTfm, i, adfCols[i], adfRows[i]);
+        ExpectPos(oCopy, i, adfCols[i], adfRows[i]);
+    }
+}
+
 TEST(BufPosTfm, Bilinear) {
     const BufPosBilinearTfm oTfm(4, 3, 0.1, 0.2, 3.7, -0.3, -1.9, 2.3, 4.1, 1e9);
     ExpectPos(oTfm, 0, 0.1, 0.2);
@@ -157,6 +171,7 @@ TEST(BufPosTfm, Block) {
 TEST(BufPosTfm, RefusalsInOrder) {
     const std::function<void(int, int)> afnMake[] = {
         [](int nCols, int nRows) { BufPosArrayTfm(nCols, nRows, nullptr, 0, nullptr, 0, true); },
+        [](int nCols, int nRows) { BufPosDoubleArrayTfm(nCols, nRows, nullptr, nullptr); },
         [](int nCols, int nRows) { BufPosBilinearTfm(nCols, nRows, 0, 0, 0, 0, 0, 0, 0, 0); },
         [](int nCols, int nRows) { BufPosScaleOffTfm(nCols, nRows, 1, 0, 1, 0, 0, 0); },
     };
@@ -170,6 +185,11 @@ TEST(BufPosTfm, RefusalsInOrder) {
                   [] { BufPosArrayTfm(1, 1, nullptr, 0, nullptr, 0, false); });
     ExpectRefusal({"pafRowPos", 1, "NULL", "non-NULL", "Row position array may not be NULL"},
                   [] { BufPosArrayTfm(1, 1, gafCols, 0, nullptr, 0, true); });
+    const double dfPos = 0.0;
+    ExpectRefusal({"padfColPos", 1, "NULL", "non-NULL", "Column position array may not be NULL"},
+                  [&] { BufPosDoubleArrayTfm(1, 1, nullptr, &dfPos); });
+    ExpectRefusal({"padfRowPos", 1, "NULL", "non-NULL", "Row position array may not be NULL"},
+                  [&] { BufPosDoubleArrayTfm(1, 1, &dfPos, nullptr); });
 }
 
 }  // namespace

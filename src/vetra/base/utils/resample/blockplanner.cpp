@@ -5,6 +5,8 @@
 #include <limits>
 #include <typeinfo>
 
+#include "vetra/base/utils/resample/engine/levels.h"
+#include "vetra/base/utils/resample/engine/positions.h"
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 #include "vetra/base/utils/resample/sizecheck.h"
 #include "vetra/faultcore/exceptions.h"
@@ -23,21 +25,22 @@ class Extent {
     Extent(int nSize, int nFirstMargin, int nLastMargin)
         : mdfSize(nSize), mdfFirstMargin(nFirstMargin), mdfLastMargin(nLastMargin) {}
 
-    // Whether the window of a position has a pixel in the source. A NaN has none.
+    // Whether the window of a position has a pixel in the source. A NaN has none. Margins are whole
+    // numbers, so that this says the same of a position as of its floor.
     bool Touches(double dfPos) const {
-        const double dfFloor = std::floor(dfPos);
-        return dfFloor + mdfLastMargin >= 0.0 && dfFloor + mdfFirstMargin <= mdfSize - 1.0;
+        return dfPos >= -mdfLastMargin && dfPos < mdfSize - mdfFirstMargin;
     }
     // Takes up the window of a position that touches the source.
     void Add(double dfPos) {
-        const double dfFloor = std::floor(dfPos);
-        mdfFirst = std::min(mdfFirst, dfFloor);
-        mdfLast = std::max(mdfLast, dfFloor);
+        mdfFirst = std::min(mdfFirst, dfPos);
+        mdfLast = std::max(mdfLast, dfPos);
     }
     bool IsEmpty() const { return mdfFirst > mdfLast; }
-    int GetFirst() const { return static_cast<int>(std::max(0.0, mdfFirst + mdfFirstMargin)); }
+    int GetFirst() const {
+        return static_cast<int>(std::max(0.0, std::floor(mdfFirst) + mdfFirstMargin));
+    }
     int GetLast() const {
-        return static_cast<int>(std::min(mdfSize - 1.0, mdfLast + mdfLastMargin));
+        return static_cast<int>(std::min(mdfSize - 1.0, std::floor(mdfLast) + mdfLastMargin));
     }
 
  private:
@@ -160,11 +163,19 @@ PixelRect BlockPlanner::FindSource(const PixelRect& oTarget) const {
             }
         }
     } else {
-        for (long long nIdx = 0; nIdx < nNumPix; ++nIdx) {
-            oPositions.GetSrcPos(nIdx, dfCol, dfRow);
-            if (oCols.Touches(dfCol) && oRows.Touches(dfRow)) {
-                oCols.Add(dfCol);
-                oRows.Add(dfRow);
+        const engine::Positions oSpans(oPositions);
+        const engine::LevelStages& oStages = engine::GetStages(engine::GetBestLevel());
+        double adfCol[engine::kSpanPixels + engine::kLanes];
+        double adfRow[engine::kSpanPixels + engine::kLanes];
+        for (long long nIdx = 0; nIdx < nNumPix; nIdx += engine::kSpanPixels) {
+            const int nPix =
+                static_cast<int>(std::min<long long>(engine::kSpanPixels, nNumPix - nIdx));
+            oSpans.Fill(oStages, nIdx, nPix, adfCol, adfRow);
+            for (int i = 0; i < nPix; ++i) {
+                if (oCols.Touches(adfCol[i]) && oRows.Touches(adfRow[i])) {
+                    oCols.Add(adfCol[i]);
+                    oRows.Add(adfRow[i]);
+                }
             }
         }
     }

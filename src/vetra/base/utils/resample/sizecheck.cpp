@@ -20,4 +20,13 @@ void CheckImageSize(int nNumCols, int nNumRows, const char* pszFile, const char*
     CheckCount(nNumRows, "nNumRows", "rows", pszFile, pszFunction, nLine);
 }
 
+void CheckPositions(const void* pPositions, const char* pszArgument, const char* pszWhat,
+                    const char* pszFile, const char* pszFunction, std::uint32_t nLine) {
+    if (pPositions == nullptr) {
+        throw ParameterException(pszArgument, ParameterException::eInvalid, "NULL", "non-NULL",
+                                 FormatString("%s position array may not be NULL", pszWhat),
+                                 pszFile, pszFunction, nLine);
+    }
+}
+
 }  // namespace vetra::utils

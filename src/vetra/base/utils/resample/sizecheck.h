@@ -3,7 +3,7 @@
 
 #include <cstdint>
 
-// Private: the size checks that buffers and position transforms share.
+// Private: the checks that buffers and position transforms share.
 namespace vetra::utils {
 
 /// Refuses fewer than one column, then fewer than one row, with `ParameterException`. The location
@@ -14,6 +14,10 @@ void CheckImageSize(int nNumCols, int nNumRows, const char* pszFile, const char*
 /// Refuses a count below 1. \p pszWhat is its name in the message, for instance "columns".
 void CheckCount(int nCount, const char* pszArgument, const char* pszWhat, const char* pszFile,
                 const char* pszFunction, std::uint32_t nLine);
+
+/// Refuses a null array of positions. \p pszWhat is "Column" or "Row".
+void CheckPositions(const void* pPositions, const char* pszArgument, const char* pszWhat,
+                    const char* pszFile, const char* pszFunction, std::uint32_t nLine);
 
 }  // namespace vetra::utils
 

@@ -11,6 +11,7 @@
 #include "vetra/base/utils/resample/blockplanner.h"
 #include "vetra/base/utils/resample/postfm/bufposarraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposbilineartfm.h"
+#include "vetra/base/utils/resample/postfm/bufposdoublearraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 
 using namespace vetra::utils;
@@ -47,7 +48,11 @@ TEST_P(Blocks, GiveTheBytesOfOneRun) {
         vfRow[i] = static_cast<float>(150 - 0.3 * x + 0.94 * y);
         if (i % 1013 == 0) vfRow[i] = NAN;
     }
+    const std::vector<double> vdfCol(vfCol.begin(), vfCol.end());
+    const std::vector<double> vdfRow(vfRow.rbegin(), vfRow.rend());
     std::vector<std::unique_ptr<IBufPosTfm>> vpoTfms;
+    vpoTfms.push_back(
+        std::make_unique<BufPosDoubleArrayTfm>(nCols, nRows, vdfCol.data(), vdfRow.data()));
     vpoTfms.push_back(
         std::make_unique<BufPosArrayTfm>(nCols, nRows, vfCol.data(), 0, vfRow.data(), 0, false));
     vpoTfms.push_back(std::make_unique<BufPosScaleOffTfm>(nCols, nRows, 611.0 / 700, 0.0,

@@ -6,6 +6,7 @@
 
 #include "vetra/base/utils/resample/postfm/bufposarraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposbilineartfm.h"
+#include "vetra/base/utils/resample/postfm/bufposdoublearraytfm.h"
 #include "vetra/base/utils/resample/postfm/bufposscaleofftfm.h"
 
 namespace vetra::utils::engine {
@@ -32,6 +33,9 @@ Positions::Positions(const IBufPosTfm& oTfm)
     if (const auto* poArray = ExactCast<BufPosArrayTfm>(*mpoWhole)) {
         meKind = Kind::eArray;
         poArray->GetTfmParameters(mpafCol, mnColOff, mpafRow, mnRowOff);
+    } else if (const auto* poDoubles = ExactCast<BufPosDoubleArrayTfm>(*mpoWhole)) {
+        meKind = Kind::eDoubleArray;
+        poDoubles->GetTfmParameters(mpadfCol, mpadfRow);
     } else if (const auto* poBilinear = ExactCast<BufPosBilinearTfm>(*mpoWhole)) {
         meKind = Kind::eBilinear;
         double* c = moCorners.adfCol;
@@ -84,6 +88,10 @@ void Positions::FillStretch(const LevelStages& oStages, long long nWholeCol, lon
         case Kind::eArray:
             oStages.pfnArrayPositions(mpafCol + nFirst, mpafRow + nFirst, mnColOff, mnRowOff, nPix,
                                       padfCol, padfRow);
+            return;
+        case Kind::eDoubleArray:
+            std::copy_n(mpadfCol + nFirst, nPix, padfCol);
+            std::copy_n(mpadfRow + nFirst, nPix, padfRow);
             return;
         case Kind::eBilinear:
             oStages.pfnBilinearPositions(moCorners, nWholeCol, nWholeRow, nPix, padfCol, padfRow);

@@ -23,7 +23,7 @@ class Positions {
               double* padfRow) const;
 
  private:
-    enum class Kind { eArray, eBilinear, eScaleOff, eOther };
+    enum class Kind { eArray, eDoubleArray, eBilinear, eScaleOff, eOther };
 
     void FillStretch(const LevelStages& oStages, long long nWholeCol, long long nWholeRow, int nPix,
                      double* padfCol, double* padfRow) const;
@@ -38,6 +38,8 @@ class Positions {
     Kind meKind = Kind::eOther;
     const float* mpafCol = nullptr;
     const float* mpafRow = nullptr;
+    const double* mpadfCol = nullptr;
+    const double* mpadfRow = nullptr;
     int mnColOff = 0;
     int mnRowOff = 0;
     BilinearCorners moCorners{};

@@ -26,14 +26,8 @@ BufPosArrayTfm::BufPosArrayTfm(int nNumCols, int nNumRows, float* pafColPos, int
                                float* pafRowPos, int nRowOff, bool bOwner) {
     Init();
     CheckImageSize(nNumCols, nNumRows, VETRA_HERE);
-    if (pafColPos == nullptr) {
-        throw ParameterException("pafColPos", ParameterException::eInvalid, "NULL", "non-NULL",
-                                 "Column position array may not be NULL", VETRA_HERE);
-    }
-    if (pafRowPos == nullptr) {
-        throw ParameterException("pafRowPos", ParameterException::eInvalid, "NULL", "non-NULL",
-                                 "Row position array may not be NULL", VETRA_HERE);
-    }
+    CheckPositions(pafColPos, "pafColPos", "Column", VETRA_HERE);
+    CheckPositions(pafRowPos, "pafRowPos", "Row", VETRA_HERE);
     mnNumCols = nNumCols;
     mnNumRows = nNumRows;
     mpafColPos = pafColPos;
