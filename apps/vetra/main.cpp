@@ -14,6 +14,7 @@
 #include "vetra/base/utils/string/stringutils.h"
 #include "vetra/faultcore/exceptions.h"
 #include "vetra/version.h"
+#include "warpcommand.h"
 
 namespace {
 
@@ -51,6 +52,7 @@ int Run(int nArgs, char** papszArgs) {
     oApp.set_version_flag("--version", "vetra " VETRA_VERSION);
     oApp.require_subcommand(1);
     AddResampleCommand(oApp);
+    AddWarpCommand(oApp);
     AddMethodsCommand(oApp);
     AddKernelCommand(oApp);
     try {

@@ -63,7 +63,7 @@ void CopyMetadata(GDALMajorObject& oSource, GDALMajorObject& oTarget) {
 // Offsets of rational polynomials count from the centre of the first pixel.
 void CopyRationalPolynomials(GDALDataset& oSource, const Grid& oGrid, GDALDataset& oTarget) {
     CPLStringList oItems(CSLDuplicate(oSource.GetMetadata("RPC")));
-    if (oItems.empty()) {
+    if (oItems.empty() || oGrid.poCrs) {
         return;
     }
     const auto Change = [&](const char* pszName, auto fnChange) {
@@ -79,14 +79,16 @@ void CopyRationalPolynomials(GDALDataset& oSource, const Grid& oGrid, GDALDatase
 }
 
 void CopyGeoreference(GDALDataset& oSource, const Grid& oGrid, GDALDataset& oTarget) {
-    if (oSource.GetSpatialRef() != nullptr) {
-        oTarget.SetSpatialRef(oSource.GetSpatialRef());
+    const OGRSpatialReference* poCrs = oGrid.poCrs ? oGrid.poCrs.get() : oSource.GetSpatialRef();
+    if (poCrs != nullptr && !poCrs->IsEmpty()) {
+        oTarget.SetSpatialRef(poCrs);
     }
     if (oGrid.oGeoTransform) {
         std::array<double, 6> vdfTfm = *oGrid.oGeoTransform;
         oTarget.SetGeoTransform(vdfTfm.data());
     }
-    const int nNumPoints = oSource.GetGCPCount();
+    // A warped image has used its points.
+    const int nNumPoints = oGrid.poCrs ? 0 : oSource.GetGCPCount();
     if (nNumPoints > 0) {
         GDAL_GCP* poPoints = GDALDuplicateGCPs(nNumPoints, oSource.GetGCPs());
         for (int n = 0; n < nNumPoints; ++n) {

@@ -12,6 +12,9 @@ namespace vetra::tool {
 /// for the new pixel grid; metadata; for each band description, colour interpretation, unit, offset
 /// and scale, category names, and with \p bSameValues the colour table.
 ///
+/// A warped target has reference system and geotransform of its grid, and neither points nor
+/// polynomials.
+///
 /// What would no longer hold is left out: statistics, the declared tuple of nodata values (the
 /// target gets a mask for it), print resolution and image size, geolocation arrays, and the domains
 /// that describe the source's file and not its image.

@@ -12,6 +12,7 @@ namespace {
 struct Messages {
     std::mutex oMutex;
     std::string sFailure;
+    std::string sWhat;  // what its thread could not do
     std::vector<std::string> oWarnings;
 };
 
@@ -20,6 +21,8 @@ Messages& GetMessages() {
     static Messages* const poMessages = new Messages;
     return *poMessages;
 }
+
+thread_local std::string sActivity;
 
 // Damage that a driver reports as a warning, filling up with invented pixels.
 bool TellsOfMissingPixels(const std::string& sMessage) {
@@ -44,6 +47,7 @@ void CPL_STDCALL Keep(CPLErr eClass, CPLErrorNum nNumber, const char* pszMessage
     if (eClass >= CE_Failure || TellsOfMissingPixels(sMessage)) {
         if (oMessages.sFailure.empty()) {
             oMessages.sFailure = sMessage;
+            oMessages.sWhat = sActivity;
         }
         return;
     }
@@ -69,6 +73,8 @@ std::string OneLine(const std::string& sText) {
 
 // The process-wide handler, because a handler that is pushed serves its own thread only.
 void GdalMessages::Collect() { CPLSetErrorHandler(Keep); }
+
+void GdalMessages::Attribute(const std::string& sWhat) { sActivity = sWhat; }
 
 void GdalMessages::ForgetFailures() {
     Messages& oMessages = GetMessages();
@@ -98,8 +104,12 @@ void GdalMessages::ThrowIfFailed(const std::string& sWhat) {
 }
 
 void GdalMessages::Throw(const std::string& sWhat) {
-    const std::string sFailure = GetFailure();
-    throw RunError(sFailure.empty() ? sWhat : sWhat + ": " + sFailure);
+    Messages& oMessages = GetMessages();
+    const std::lock_guard<std::mutex> oLock(oMessages.oMutex);
+    if (oMessages.sFailure.empty()) {
+        throw RunError(sWhat);
+    }
+    throw RunError((oMessages.sWhat.empty() ? sWhat : oMessages.sWhat) + ": " + oMessages.sFailure);
 }
 
 std::vector<std::string> GdalMessages::GetWarnings() {

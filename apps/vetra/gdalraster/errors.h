@@ -26,6 +26,9 @@ std::string OneLine(const std::string& sText);
 class GdalMessages {
  public:
     static void Collect();
+    /// From now on failures on this thread tell what could not be done, whoever finds them: where
+    /// threads read and write at once, either may be the first to look.
+    static void Attribute(const std::string& sWhat);
     /// Forgets the failures, not the warnings.
     static void ForgetFailures();
     /// The first failure since then, which names the cause where later ones are its consequences;
@@ -33,7 +36,8 @@ class GdalMessages {
     static std::string GetFailure();
     /// Turns a failure into a warning that begins with \p sWhat.
     static void Demote(const std::string& sWhat);
-    /// Throws when there was a failure. \param sWhat  what could not be done
+    /// Throws when there was a failure. \param sWhat  what could not be done, unless its thread
+    /// said
     static void ThrowIfFailed(const std::string& sWhat);
     /// Throws in any case, with the failure if there was one.
     [[noreturn]] static void Throw(const std::string& sWhat);

@@ -2,8 +2,10 @@
 #define VETRA_APPS_GDALRASTER_GRID_H
 
 #include <gdal_priv.h>
+#include <ogr_spatialref.h>
 
 #include <array>
+#include <memory>
 #include <optional>
 
 namespace vetra::tool {
@@ -21,13 +23,16 @@ struct GridRequest {
     double dfY = 1.0;
 };
 
-/// The target's pixels: those of the source, coarser or finer, from the same upper left corner.
+/// The target's pixels. Without a reference system of their own they are those of the source,
+/// coarser or finer, from the same upper left corner.
 struct Grid {
     int nCols = 0;
     int nRows = 0;
     double dfColScale = 1.0;  ///< source columns per target column
     double dfRowScale = 1.0;
     std::optional<std::array<double, 6>> oGeoTransform;
+    /// That of a warped target; it may be empty. Scales mean nothing then.
+    std::shared_ptr<const OGRSpatialReference> poCrs;
 
     /// A pixel-edge column of the source, counted in target columns; rows likewise.
     double ToTargetCol(double dfSrcCol) const { return dfSrcCol / dfColScale; }

@@ -17,7 +17,55 @@ namespace {
 
 bool IsAlpha(GDALRasterBand& oBand) { return oBand.GetColorInterpretation() == GCI_AlphaBand; }
 
+std::vector<gobs::NativeDataTypeCode> GetTypes(const SourceRaster& oSource) {
+    std::vector<gobs::NativeDataTypeCode> oTypes;
+    for (const SourceBand& oBand : oSource.GetBands()) {
+        oTypes.push_back(oBand.eType);
+    }
+    return oTypes;
+}
+
 }  // namespace
+
+SourceBlock::SourceBlock(const SourceRaster& oSource, bool bJoined)
+    : mpoSource(&oSource),
+      moArrays(GetTypes(oSource), bJoined),
+      moBandMasks(oSource.GetBands().size()) {}
+
+int SourceBlock::GetPixelBytes() const {
+    int nBytes = moArrays.GetPixelBytes() + (mpoSource->HasSharedMask() ? 1 : 0);
+    bool bNodata = false;
+    for (const SourceBand& oBand : mpoSource->GetBands()) {
+        nBytes += oBand.poMask != nullptr ? 1 : 0;
+        bNodata = bNodata || oBand.oNodata.has_value();
+    }
+    return nBytes + (bNodata ? 1 : 0);
+}
+
+utils::ResampleBuffer SourceBlock::GetGroup(int nGroup) {
+    const auto n = static_cast<std::size_t>(nGroup);
+    const SourceBand& oBand = mpoSource->GetBands()[n];
+    unsigned char* pabyShared = mpoSource->HasSharedMask() ? moSharedMask.Get() : nullptr;
+    if (!oBand.oNodata && oBand.poMask == nullptr) {
+        return moArrays.GetGroup(nGroup, pabyShared);
+    }
+    const auto nNumPix = static_cast<std::size_t>(moRect.GetNumPix());
+    unsigned char* pabyMask = moBandMasks[n].Get();
+    if (oBand.poMask == nullptr) {
+        moNodataMask.Reserve(nNumPix);
+        pabyMask = moNodataMask.Get();
+        std::memset(pabyMask, 1, nNumPix);
+    }
+    if (pabyShared != nullptr) {
+        std::transform(pabyMask, pabyMask + nNumPix, pabyShared, pabyMask,
+                       [](unsigned char a, unsigned char b) { return std::min(a, b); });
+    }
+    const utils::ResampleBuffer oGroup = moArrays.GetGroup(nGroup, pabyMask);
+    if (oBand.oNodata) {
+        oBand.oNodata->Mask(oBand.eType, oGroup.GetBuf(), moRect.GetNumPix(), pabyMask);
+    }
+    return oGroup;
+}
 
 SourceRaster::SourceRaster(const std::string& sPath, const std::optional<NodataValue>& oNodata)
     : msPath(sPath) {
@@ -94,65 +142,36 @@ bool SourceRaster::Owns(const std::string& sPath) {
     return bOwns;
 }
 
-int SourceRaster::GetMaskBytes() const {
-    return (mpoSharedMask != nullptr ? 1 : 0) + (HasOneMask() ? 0 : 1);
-}
-
-void SourceRaster::Read(const utils::PixelRect& oRect, BandArrays& oArrays) {
-    moRect = oRect;
-    oArrays.Resize(oRect.nCols, oRect.nRows);
-    GdalMessages::ForgetFailures();
-    if (!oArrays.Transfer(*mpoDataset, GF_Read, oRect)) {
-        ThrowUnreadable();
+void SourceRaster::Read(const utils::PixelRect& oRect, SourceBlock& oBlock) {
+    oBlock.moRect = oRect;
+    oBlock.moArrays.Resize(oRect.nCols, oRect.nRows);
+    if (!oBlock.moArrays.Transfer(*mpoDataset, GF_Read, oRect)) {
+        GdalMessages::Throw(GetReadFailure());
     }
     if (mpoSharedMask != nullptr) {
-        moSharedMask.Reserve(static_cast<std::size_t>(oRect.GetNumPix()));
-        ReadMask(*mpoSharedMask, moSharedMask.Get());
+        ReadMask(*mpoSharedMask, oRect, oBlock.moSharedMask);
     }
-    if (!GdalMessages::GetFailure().empty()) {
-        ThrowUnreadable();
+    for (std::size_t n = 0; n < moBands.size(); ++n) {
+        if (moBands[n].poMask != nullptr) {
+            ReadMask(*moBands[n].poMask, oRect, oBlock.moBandMasks[n]);
+        }
     }
+    GdalMessages::ThrowIfFailed(GetReadFailure());
 }
 
-unsigned char* SourceRaster::GetMask(int nGroup, BandArrays& oArrays) {
-    const SourceBand& oBand = moBands[static_cast<std::size_t>(nGroup)];
-    unsigned char* pabyShared = mpoSharedMask != nullptr ? moSharedMask.Get() : nullptr;
-    if (!oBand.oNodata && oBand.poMask == nullptr) {
-        return pabyShared;
-    }
-    const auto nNumPix = static_cast<std::size_t>(moRect.GetNumPix());
-    moBandMask.Reserve(nNumPix);
-    unsigned char* pabyMask = moBandMask.Get();
-    if (oBand.poMask != nullptr) {
-        ReadMask(*oBand.poMask, pabyMask);
-    } else {
-        std::memset(pabyMask, 1, nNumPix);
-    }
-    if (pabyShared != nullptr) {
-        std::transform(pabyMask, pabyMask + nNumPix, pabyShared, pabyMask,
-                       [](unsigned char a, unsigned char b) { return std::min(a, b); });
-    }
-    if (oBand.oNodata) {
-        oBand.oNodata->Mask(oBand.eType, oArrays.GetGroup(nGroup, nullptr).GetBuf(),
-                            moRect.GetNumPix(), pabyMask);
-    }
-    return pabyMask;
-}
-
-void SourceRaster::ReadMask(GDALRasterBand& oMask, unsigned char* pabyMask) {
-    if (oMask.RasterIO(GF_Read, moRect.nCol, moRect.nRow, moRect.nCols, moRect.nRows, pabyMask,
-                       moRect.nCols, moRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
-        ThrowUnreadable();
+void SourceRaster::ReadMask(GDALRasterBand& oMask, const utils::PixelRect& oRect,
+                            ByteArray& oBytes) {
+    const long long nNumPix = oRect.GetNumPix();
+    oBytes.Reserve(static_cast<std::size_t>(nNumPix));
+    unsigned char* pabyMask = oBytes.Get();
+    if (oMask.RasterIO(GF_Read, oRect.nCol, oRect.nRow, oRect.nCols, oRect.nRows, pabyMask,
+                       oRect.nCols, oRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
+        GdalMessages::Throw(GetReadFailure());
     }
     // Masks of files hold 0 and 255 or anything between; the engine knows 0 and 1.
-    const long long nNumPix = moRect.GetNumPix();
     for (long long n = 0; n < nNumPix; ++n) {
         pabyMask[n] = pabyMask[n] != 0 ? 1 : 0;
     }
-}
-
-void SourceRaster::ThrowUnreadable() const {
-    GdalMessages::Throw("can't read the pixels of the source " + msPath);
 }
 
 }  // namespace vetra::tool

@@ -21,6 +21,32 @@ struct SourceBand {
     GDALRasterBand* poMask;
 };
 
+class SourceRaster;
+
+/// The samples and the validity of a rectangle of a source.
+class SourceBlock {
+ public:
+    /// \param oSource  must outlive this object
+    /// \param bJoined  as for `BandArrays`
+    SourceBlock(const SourceRaster& oSource, bool bJoined);
+
+    /// Bytes per pixel for samples and masks.
+    int GetPixelBytes() const;
+    /// A view on a group with its mask, one byte per pixel, 1 for valid; without one when all
+    /// pixels are valid. Holds until the next call.
+    utils::ResampleBuffer GetGroup(int nGroup);
+
+ private:
+    friend class SourceRaster;
+
+    const SourceRaster* mpoSource;
+    utils::PixelRect moRect;
+    BandArrays moArrays;
+    ByteArray moSharedMask;
+    std::vector<ByteArray> moBandMasks;
+    ByteArray moNodataMask;
+};
+
 /// The source image, and which of its pixels are valid.
 ///
 /// A pixel of a band is valid when nothing speaks against it: neither a mask band of the image, nor
@@ -46,26 +72,22 @@ class SourceRaster {
     /// Whether the path names one of the files that the image consists of.
     bool Owns(const std::string& sPath);
 
-    /// Bytes per pixel that `Read` and `GetMask` keep for masks.
-    int GetMaskBytes() const;
-    /// Reads all bands and masks of a rectangle.
-    /// \throws RunError when a part can't be read.
-    void Read(const utils::PixelRect& oRect, BandArrays& oArrays);
-    /// The mask of a group of the arrays of the last `Read`, one byte per pixel, 1 for valid; null
-    /// when all are valid. Holds until the next call.
-    unsigned char* GetMask(int nGroup, BandArrays& oArrays);
+    bool HasSharedMask() const { return mpoSharedMask != nullptr; }
+
+    /// What it means that `Read` fails.
+    std::string GetReadFailure() const { return "can't read the pixels of the source " + msPath; }
+    /// Reads all bands and masks of a rectangle. The image is used by one thread at a time, a block
+    /// that was read by any.
+    /// \throws RunError when a part can't be read, or GDAL has reported a failure before.
+    void Read(const utils::PixelRect& oRect, SourceBlock& oBlock);
 
  private:
-    void ReadMask(GDALRasterBand& oMask, unsigned char* pabyMask);
-    [[noreturn]] void ThrowUnreadable() const;
+    void ReadMask(GDALRasterBand& oMask, const utils::PixelRect& oRect, ByteArray& oBytes);
 
     std::string msPath;
     GDALDatasetUniquePtr mpoDataset;
     std::vector<SourceBand> moBands;
     GDALRasterBand* mpoSharedMask = nullptr;
-    utils::PixelRect moRect;
-    ByteArray moSharedMask;
-    ByteArray moBandMask;
 };
 
 }  // namespace vetra::tool

@@ -10,6 +10,7 @@ namespace vetra::tool {
 namespace {
 
 constexpr const char* kGTiff = "GTiff";
+constexpr const char* kCog = "COG";
 // Images beyond this size, both ways, are written in tiles: parts of them can be read at once.
 constexpr int kLargestStriped = 512;
 
@@ -28,6 +29,20 @@ bool HasExtension(GDALDriver& oDriver, const std::string& sExtension) {
     const CPLStringList oExtensions(
         CSLTokenizeString(pszExtensions != nullptr ? pszExtensions : ""));
     return oExtensions.FindString(sExtension.c_str()) >= 0;
+}
+
+CPLStringList ToList(const std::vector<std::string>& oOptions) {
+    CPLStringList oList;
+    for (const std::string& sOption : oOptions) {
+        oList.AddString(sOption.c_str());
+    }
+    return oList;
+}
+
+void AddDefault(CPLStringList& oOptions, const char* pszName, const char* pszValue) {
+    if (oOptions.FetchNameValue(pszName) == nullptr) {
+        oOptions.SetNameValue(pszName, pszValue);
+    }
 }
 
 GDALDriver* FindByExtension(const std::string& sExtension) {
@@ -89,30 +104,45 @@ void TargetFormat::CheckHolds(gobs::NativeDataTypeCode eType) const {
     }
 }
 
+std::string TargetFormat::ChooseOverviews(const std::string& sWanted,
+                                          const std::vector<std::string>& oUserOptions,
+                                          bool bSameValues) const {
+    const bool bCog = EQUAL(GetName().c_str(), kCog);
+    if (!sWanted.empty() && !bCog && !EQUAL(GetName().c_str(), kGTiff)) {
+        throw UsageError("--overviews: the format " + GetName() + " gets none, only GeoTIFF does");
+    }
+    if (!sWanted.empty() || !bCog || ToList(oUserOptions).FetchNameValue("OVERVIEWS") != nullptr) {
+        return sWanted;
+    }
+    return bSameValues ? "NEAR" : "AVERAGE,NUMCOLS=2,NUMROWS=2";
+}
+
+CPLStringList TargetFormat::CompleteCopyOptions(
+    const std::vector<std::string>& oUserOptions) const {
+    CPLStringList oOptions = ToList(oUserOptions);
+    if (EQUAL(GetName().c_str(), kCog)) {
+        AddDefault(oOptions, "BIGTIFF", "IF_SAFER");
+        AddDefault(oOptions, "OVERVIEWS", "FORCE_USE_EXISTING");
+    }
+    return oOptions;
+}
+
 GDALDriver& GetStageDriver() { return *GetGDALDriverManager()->GetDriverByName(kGTiff); }
 
 CPLStringList CompleteOptions(GDALDriver& oDriver, const std::vector<std::string>& oUserOptions,
                               SourceRaster& oSource, const Grid& oGrid,
                               gobs::NativeDataTypeCode eType) {
-    CPLStringList oOptions;
-    for (const std::string& sOption : oUserOptions) {
-        oOptions.AddString(sOption.c_str());
-    }
-    const auto AddDefault = [&](const char* pszName, const char* pszValue) {
-        if (oOptions.FetchNameValue(pszName) == nullptr) {
-            oOptions.SetNameValue(pszName, pszValue);
-        }
-    };
+    CPLStringList oOptions = ToList(oUserOptions);
     if (IsMarkedSignedByte(eType)) {
-        AddDefault("PIXELTYPE", "SIGNEDBYTE");
+        AddDefault(oOptions, "PIXELTYPE", "SIGNEDBYTE");
     }
     if (!EQUAL(oDriver.GetDescription(), kGTiff)) {
         return oOptions;
     }
-    AddDefault("BIGTIFF", "IF_SAFER");
+    AddDefault(oOptions, "BIGTIFF", "IF_SAFER");
     if (oGrid.nCols > kLargestStriped && oGrid.nRows > kLargestStriped &&
         oOptions.FetchNameValue("BLOCKYSIZE") == nullptr) {
-        AddDefault("TILED", "YES");
+        AddDefault(oOptions, "TILED", "YES");
     }
     // The driver would guess colours from the number of bands.
     GDALDataset& oDataset = oSource.GetDataset();
@@ -124,12 +154,12 @@ CPLStringList CompleteOptions(GDALDriver& oDriver, const std::vector<std::string
     int nColours = 1;
     if (Colour(1) == GCI_RedBand && Colour(2) == GCI_GreenBand && Colour(3) == GCI_BlueBand) {
         nColours = 3;
-        AddDefault("PHOTOMETRIC", "RGB");
+        AddDefault(oOptions, "PHOTOMETRIC", "RGB");
     } else if (Colour(1) == GCI_CyanBand && Colour(4) == GCI_BlackBand) {
         nColours = 4;
-        AddDefault("PHOTOMETRIC", "CMYK");
+        AddDefault(oOptions, "PHOTOMETRIC", "CMYK");
     } else if (Colour(1) != GCI_PaletteIndex) {
-        AddDefault("PHOTOMETRIC", "MINISBLACK");
+        AddDefault(oOptions, "PHOTOMETRIC", "MINISBLACK");
     }
     if (oDataset.GetRasterCount() > nColours) {
         const bool bAlpha = Colour(nColours + 1) == GCI_AlphaBand;
@@ -137,7 +167,7 @@ CPLStringList CompleteOptions(GDALDriver& oDriver, const std::vector<std::string
             bAlpha
                 ? oDataset.GetRasterBand(nColours + 1)->GetMetadataItem("ALPHA", "IMAGE_STRUCTURE")
                 : nullptr;
-        AddDefault("ALPHA", pszKind != nullptr ? pszKind : (bAlpha ? "YES" : "NO"));
+        AddDefault(oOptions, "ALPHA", pszKind != nullptr ? pszKind : (bAlpha ? "YES" : "NO"));
     }
     return oOptions;
 }

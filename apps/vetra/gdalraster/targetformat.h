@@ -27,6 +27,16 @@ class TargetFormat {
     /// Tells before the run what only its end would show.
     /// \throws RunError when the format doesn't hold pixels of this type.
     void CheckHolds(gobs::NativeDataTypeCode eType) const;
+    /// The method of the target's overviews, empty when it has none. A cloud optimized GeoTIFF has
+    /// them unless its options speak of them.
+    /// \param sWanted      what the user wants; may be empty
+    /// \param bSameValues  whether overviews must not have values that the image doesn't have
+    /// \throws UsageError when overviews are wanted in another format.
+    std::string ChooseOverviews(const std::string& sWanted,
+                                const std::vector<std::string>& oUserOptions,
+                                bool bSameValues) const;
+    /// Adds to a user's options what a copy should have beyond them.
+    CPLStringList CompleteCopyOptions(const std::vector<std::string>& oUserOptions) const;
 
  private:
     GDALDriver* mpoDriver;

@@ -12,7 +12,6 @@ namespace vetra::tool {
 namespace {
 
 constexpr const char* kCannotCreate = "can't create the target";
-constexpr const char* kCannotWrite = "can't write the target";
 
 }  // namespace
 
@@ -58,48 +57,49 @@ TargetRaster::~TargetRaster() {
     }
 }
 
+int TargetRaster::GetPieceCols() const {
+    int nCols = 0;
+    int nRows = 0;
+    mpoDataset->GetRasterBand(1)->GetBlockSize(&nCols, &nRows);
+    return nCols;
+}
+
 void TargetRaster::Write(const utils::PixelRect& oRect, BandArrays& oArrays,
                          unsigned char* pabyMask) {
-    GdalMessages::ForgetFailures();
     if (!oArrays.Transfer(*mpoDataset, GF_Write, oRect)) {
-        GdalMessages::Throw(kCannotWrite);
+        GdalMessages::Throw(GetWriteFailure());
     }
     if (mpoMask != nullptr &&
         mpoMask->RasterIO(GF_Write, oRect.nCol, oRect.nRow, oRect.nCols, oRect.nRows, pabyMask,
                           oRect.nCols, oRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
-        GdalMessages::Throw(kCannotWrite);
+        GdalMessages::Throw(GetWriteFailure());
     }
     // A block that the cache writes later fails without a status for anyone.
-    GdalMessages::ThrowIfFailed(kCannotWrite);
+    GdalMessages::ThrowIfFailed(GetWriteFailure());
 }
 
 void TargetRaster::Close() {
     GdalMessages::ForgetFailures();
     mpoDataset->FlushCache(false);
-    GdalMessages::ThrowIfFailed(kCannotWrite);
+    GdalMessages::ThrowIfFailed(GetWriteFailure());
     mpoDataset.reset();
-    GdalMessages::ThrowIfFailed(kCannotWrite);
+    GdalMessages::ThrowIfFailed(GetWriteFailure());
 }
 
 void CopyRaster(const std::string& sFrom, GDALDriver& oDriver, const std::string& sTo,
-                const std::vector<std::string>& oOptions, GDALProgressFunc fnProgress,
-                void* poProgressData) {
-    CPLStringList oList;
-    for (const std::string& sOption : oOptions) {
-        oList.AddString(sOption.c_str());
-    }
+                const CPLStringList& oOptions, GDALProgressFunc fnProgress, void* poProgressData) {
     GdalMessages::ForgetFailures();
     const GDALDatasetUniquePtr poFrom(GDALDataset::Open(sFrom.c_str(), GDAL_OF_RASTER));
     if (!poFrom) {
-        GdalMessages::Throw(kCannotWrite);
+        GdalMessages::Throw(TargetRaster::GetWriteFailure());
     }
-    GDALDatasetUniquePtr poTo(oDriver.CreateCopy(sTo.c_str(), poFrom.get(), TRUE, oList.List(),
+    GDALDatasetUniquePtr poTo(oDriver.CreateCopy(sTo.c_str(), poFrom.get(), TRUE, oOptions.List(),
                                                  fnProgress, poProgressData));
     if (!poTo) {
-        GdalMessages::Throw(kCannotWrite);
+        GdalMessages::Throw(TargetRaster::GetWriteFailure());
     }
     poTo.reset();
-    GdalMessages::ThrowIfFailed(kCannotWrite);
+    GdalMessages::ThrowIfFailed(TargetRaster::GetWriteFailure());
 }
 
 }  // namespace vetra::tool

@@ -1,6 +1,7 @@
 #ifndef VETRA_APPS_GDALRASTER_TARGETRASTER_H
 #define VETRA_APPS_GDALRASTER_TARGETRASTER_H
 
+#include <cpl_string.h>
 #include <gdal_priv.h>
 
 #include <optional>
@@ -36,7 +37,12 @@ class TargetRaster {
     TargetRaster& operator=(const TargetRaster&) = delete;
     ~TargetRaster();
 
+    /// What it means that `Write` fails.
+    static std::string GetWriteFailure() { return "can't write the target"; }
+    /// Columns of the pieces in which the file is written.
+    int GetPieceCols() const;
     /// Writes a rectangle of all bands, and its mask (0 or 255 per pixel) where there is one.
+    /// \throws RunError also when GDAL has reported a failure before.
     void Write(const utils::PixelRect& oRect, BandArrays& oArrays, unsigned char* pabyMask);
     /// Writes what is still in memory.
     void Close();
@@ -49,8 +55,7 @@ class TargetRaster {
 /// Writes a finished image as another format.
 /// \param fnProgress  as `GDALProgressFunc`; stops the work by returning FALSE
 void CopyRaster(const std::string& sFrom, GDALDriver& oDriver, const std::string& sTo,
-                const std::vector<std::string>& oOptions, GDALProgressFunc fnProgress,
-                void* poProgressData);
+                const CPLStringList& oOptions, GDALProgressFunc fnProgress, void* poProgressData);
 
 }  // namespace vetra::tool
 

@@ -1,5 +1,6 @@
 #include "rasterjob/interrupt.h"
 
+#include <atomic>
 #include <csignal>
 #include <cstdlib>
 #include <initializer_list>
@@ -8,7 +9,9 @@ namespace vetra::tool {
 
 namespace {
 
-volatile std::sig_atomic_t nCaught = 0;
+// Any thread may look.
+std::atomic<int> nCaught = 0;
+static_assert(std::atomic<int>::is_always_lock_free);
 
 void Remember(int nSignal) { nCaught = nSignal; }
 
@@ -28,8 +31,8 @@ void CatchSignals() {
 int GetInterrupt() { return nCaught; }
 
 void ThrowIfInterrupted() {
-    if (nCaught != 0) {
-        throw Interrupted{nCaught};
+    if (const int nSignal = nCaught) {
+        throw Interrupted{nSignal};
     }
 }
 

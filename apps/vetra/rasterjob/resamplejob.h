@@ -1,32 +1,24 @@
 #ifndef VETRA_APPS_RASTERJOB_RESAMPLEJOB_H
 #define VETRA_APPS_RASTERJOB_RESAMPLEJOB_H
 
-#include <optional>
 #include <string>
-#include <vector>
 
+#include "gdalraster/geotransformer.h"
 #include "gdalraster/grid.h"
-#include "gdalraster/nodatavalue.h"
-#include "vetra/base/utils/resample/resampleinfo.h"
-#include "vetra/basic/gobs/raster/datatypeadapter.h"
+#include "gdalraster/warpgrid.h"
+#include "rasterjob/rasteroptions.h"
 
 namespace vetra::tool {
 
-/// What a user asks for.
-struct ResampleOptions {
-    std::string sSource;
-    std::string sTarget;
+struct ResampleOptions : RasterOptions {
     GridRequest oGrid;
-    std::string sMethod = "BILIN";                  ///< a resampler string
-    std::optional<gobs::NativeDataTypeCode> oType;  ///< that of the source if absent
-    std::optional<NodataValue> oNodata;             ///< replaces that of the source's bands
-    std::optional<NodataValue> oTargetNodata;       ///< that of the source if absent
-    std::optional<utils::NodataFillAction> eFill;   ///< that of the method string if absent
-    int nThreads = 0;                               ///< 0 for all processors
-    long long nMemoryMb = 512;                      ///< limit for the whole process
-    std::string sFormat;                            ///< by the target's extension if empty
-    std::vector<std::string> oCreationOptions;
-    bool bQuiet = false;
+};
+
+struct WarpOptions : RasterOptions {
+    GeoReference oReference;
+    WarpRequest oGrid;
+    std::string sLike;      ///< an image whose grid and reference system count; else empty
+    double dfError = 0.01;  ///< bound for positions in source pixels; 0 for exact ones
 };
 
 /// Resamples an image file block by block. The pixels of the target depend on neither threads nor
@@ -34,6 +26,8 @@ struct ResampleOptions {
 ///
 /// \throws RunError, UsageError, Interrupted and the engine's exceptions.
 void RunResample(const ResampleOptions& oOptions);
+/// As above, into another reference system or grid.
+void RunWarp(const WarpOptions& oOptions);
 
 }  // namespace vetra::tool
 

@@ -29,8 +29,8 @@ class TargetFile {
 
     /// Where to write the file: the target's name in the folder.
     std::string GetPath() const { return moFolder / moPath.filename(); }
-    /// Where to write an image that the target is made from.
-    std::string GetStagePath() const { return moStage / "stage.tif"; }
+    /// Where to write a file that the target is made from. \param sName  one for each such file
+    std::string GetStagePath(const std::string& sName) const { return moStage / sName; }
     /// Moves the file and others that are written beside it to their place.
     void Commit();
     /// As above, and side files of an image that was there before go: they would be taken for those
