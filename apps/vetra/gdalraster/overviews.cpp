@@ -7,12 +7,14 @@
 #include <vector>
 
 #include "gdalraster/errors.h"
+#include "vetra/base/utils/resample/postfm/bufposblocktfm.h"
 
 namespace vetra::tool {
 
 namespace {
 
 constexpr int kLargestLast = 256;
+constexpr int kPiecesAtOnce = 16;
 constexpr const char* kCannotAdd = "can't add overviews";
 
 GDALDatasetUniquePtr Open(const std::string& sPath, unsigned nFlags) {
@@ -23,15 +25,15 @@ GDALDatasetUniquePtr Open(const std::string& sPath, unsigned nFlags) {
     return poImage;
 }
 
-void CopyRows(GDALRasterBand& oFrom, GDALRasterBand& oTo, int nRow, int nRows,
-              std::vector<unsigned char>& vbyRows) {
+void CopyPixels(GDALRasterBand& oFrom, GDALRasterBand& oTo, const utils::PixelRect& oRect,
+                std::vector<unsigned char>& vbyPixels) {
     const GDALDataType eType = oFrom.GetRasterDataType();
-    const int nCols = oFrom.GetXSize();
-    vbyRows.resize(static_cast<std::size_t>(nCols) * static_cast<std::size_t>(nRows) *
-                   static_cast<std::size_t>(GDALGetDataTypeSizeBytes(eType)));
+    vbyPixels.resize(static_cast<std::size_t>(oRect.GetNumPix()) *
+                     static_cast<std::size_t>(GDALGetDataTypeSizeBytes(eType)));
     for (const auto& [poBand, eDirection] : {std::pair(&oFrom, GF_Read), {&oTo, GF_Write}}) {
-        if (poBand->RasterIO(eDirection, 0, nRow, nCols, nRows, vbyRows.data(), nCols, nRows, eType,
-                             0, 0, nullptr) != CE_None) {
+        if (poBand->RasterIO(eDirection, oRect.nCol, oRect.nRow, oRect.nCols, oRect.nRows,
+                             vbyPixels.data(), oRect.nCols, oRect.nRows, eType, 0, 0,
+                             nullptr) != CE_None) {
             GdalMessages::Throw(kCannotAdd);
         }
     }
@@ -82,18 +84,26 @@ void FillOverview(const std::string& sPath, int nLevel, const std::string& sFrom
     };
     GDALRasterBand& oFromMask = *poFrom->GetRasterBand(1)->GetMaskBand();
     const bool bMask = poFrom->GetRasterBand(1)->GetMaskFlags() == GMF_PER_DATASET;
-    std::vector<unsigned char> vbyRows;
-    int nCols = 0;
-    int nPieceRows = 0;
-    Overview(1)->GetBlockSize(&nCols, &nPieceRows);
-    for (int nRow = 0; nRow < poFrom->GetRasterYSize(); nRow += nPieceRows) {
-        fnCheck();
-        const int nRows = std::min(nPieceRows, poFrom->GetRasterYSize() - nRow);
-        for (int nBand = 1; nBand <= poFrom->GetRasterCount(); ++nBand) {
-            CopyRows(*poFrom->GetRasterBand(nBand), *Overview(nBand), nRow, nRows, vbyRows);
-        }
-        if (bMask) {
-            CopyRows(oFromMask, *Overview(1)->GetMaskBand(), nRow, nRows, vbyRows);
+    std::vector<unsigned char> vbyPixels;
+    // Pieces as they are in the file, some side by side.
+    int nAcross = 0;
+    int nDown = 0;
+    Overview(1)->GetBlockSize(&nAcross, &nDown);
+    nAcross *= kPiecesAtOnce;
+    const int nCols = poFrom->GetRasterXSize();
+    const int nRows = poFrom->GetRasterYSize();
+    utils::PixelRect oRect;
+    for (oRect.nRow = 0; oRect.nRow < nRows; oRect.nRow += oRect.nRows) {
+        oRect.nRows = std::min(nDown, nRows - oRect.nRow);
+        for (oRect.nCol = 0; oRect.nCol < nCols; oRect.nCol += oRect.nCols) {
+            oRect.nCols = std::min(nAcross, nCols - oRect.nCol);
+            fnCheck();
+            for (int nBand = 1; nBand <= poFrom->GetRasterCount(); ++nBand) {
+                CopyPixels(*poFrom->GetRasterBand(nBand), *Overview(nBand), oRect, vbyPixels);
+            }
+            if (bMask) {
+                CopyPixels(oFromMask, *Overview(1)->GetMaskBand(), oRect, vbyPixels);
+            }
         }
     }
     Close(std::move(poImage));
