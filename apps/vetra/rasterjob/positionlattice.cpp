@@ -139,8 +139,7 @@ void PositionLattice::FillCell(GeoTransformer& oTransformer, int nCol, int nRow,
                 vdfWeights[3][n] * padfRow[3]) +
                vdfWeights[4][n] * padfRow[4];
     };
-    bool bGood =
-        std::none_of(adfCol, adfCol + kPlaces, [](double df) { return std::isnan(df); });
+    bool bGood = std::none_of(adfCol, adfCol + kPlaces, [](double df) { return std::isnan(df); });
     double adfColRow[kNodes];
     double adfRowRow[kNodes];
     for (std::size_t y = 0; y < kMids && bGood; ++y) {
@@ -148,9 +147,9 @@ void PositionLattice::FillCell(GeoTransformer& oTransformer, int nCol, int nRow,
         Combine(adfRow, mvdfMidWeights, y, adfRowRow);
         for (std::size_t x = 0; x < kMids; ++x) {
             const std::size_t nExact = kNumNodes + y * kMids + x;
-            bGood = bGood &&
-                    std::hypot(Along(adfColRow, mvdfMidWeights, x) - adfCol[nExact],
-                               Along(adfRowRow, mvdfMidWeights, x) - adfRow[nExact]) <= kCheckedShare * mdfError;
+            bGood = bGood && std::hypot(Along(adfColRow, mvdfMidWeights, x) - adfCol[nExact],
+                                        Along(adfRowRow, mvdfMidWeights, x) - adfRow[nExact]) <=
+                                 kCheckedShare * mdfError;
         }
     }
     if (!bGood) {
