@@ -47,6 +47,10 @@ TargetRaster::TargetRaster(GDALDriver& oDriver, const std::string& sPath, const 
         }
         mpoMask = mpoDataset->GetRasterBand(1)->GetMaskBand();
     }
+    mpoDataset->GetRasterBand(1)->GetBlockSize(&mnPieceCols, &mnPieceRows);
+    mnPixelBytes =
+        static_cast<long long>(nNumBands) * gobs::DataTypeAdapter::ByteSize(oPlan.eType) +
+        (oPlan.bMaskBand ? 1 : 0);
     GdalMessages::ThrowIfFailed(kCannotCreate);
 }
 
@@ -57,11 +61,12 @@ TargetRaster::~TargetRaster() {
     }
 }
 
-int TargetRaster::GetPieceCols() const {
-    int nCols = 0;
-    int nRows = 0;
-    mpoDataset->GetRasterBand(1)->GetBlockSize(&nCols, &nRows);
-    return nCols;
+bool TargetRaster::EndsWithPieces(const utils::PixelRect& oRect) const {
+    const auto Ends = [](int nEnd, int nPiece, int nSize) {
+        return nEnd % nPiece == 0 || nEnd == nSize;
+    };
+    return Ends(oRect.nCol + oRect.nCols, mnPieceCols, mpoDataset->GetRasterXSize()) &&
+           Ends(oRect.nRow + oRect.nRows, mnPieceRows, mpoDataset->GetRasterYSize());
 }
 
 void TargetRaster::Write(const utils::PixelRect& oRect, BandArrays& oArrays,
@@ -74,7 +79,18 @@ void TargetRaster::Write(const utils::PixelRect& oRect, BandArrays& oArrays,
                           oRect.nCols, oRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
         GdalMessages::Throw(GetWriteFailure());
     }
-    // A block that the cache writes later fails without a status for anyone.
+    // Whole pieces are best: a part would be read back and written a second time.
+    mnDirtyPixels += oRect.GetNumPix();
+    const long long nMostPixels = GDALGetCacheMax64() / 2 / mnPixelBytes;
+    if (mnDirtyPixels > nMostPixels || (mnDirtyPixels > nMostPixels / 2 && EndsWithPieces(oRect))) {
+        mnDirtyPixels = 0;
+        for (GDALRasterBand* poBand : mpoDataset->GetBands()) {
+            poBand->FlushCache(false);
+        }
+        if (mpoMask != nullptr) {
+            mpoMask->FlushCache(false);
+        }
+    }
     GdalMessages::ThrowIfFailed(GetWriteFailure());
 }
 

@@ -40,16 +40,35 @@ class TargetRaster {
     /// What it means that `Write` fails.
     static std::string GetWriteFailure() { return "can't write the target"; }
     /// Columns of the pieces in which the file is written.
-    int GetPieceCols() const;
-    /// Writes a rectangle of all bands, and its mask (0 or 255 per pixel) where there is one.
+    int GetPieceCols() const { return mnPieceCols; }
+    /// Writes a rectangle of all bands, and its mask (0 or 255 per pixel) where there is one. Other
+    /// threads may read other images meanwhile.
     /// \throws RunError also when GDAL has reported a failure before.
     void Write(const utils::PixelRect& oRect, BandArrays& oArrays, unsigned char* pabyMask);
     /// Writes what is still in memory.
     void Close();
 
  private:
+    // Keeps dirty blocks in GDAL's cache for this object's thread to write. Another thread, that
+    // reads, would take them out of the cache to make room and write them then; a block asked for
+    // in between would come from the file as it was before.
+    struct DirtyBlocksStay {
+        DirtyBlocksStay() { GDALRasterBlock::EnterDisableDirtyBlockFlush(); }
+        DirtyBlocksStay(const DirtyBlocksStay&) = delete;
+        DirtyBlocksStay& operator=(const DirtyBlocksStay&) = delete;
+        ~DirtyBlocksStay() { GDALRasterBlock::LeaveDisableDirtyBlockFlush(); }
+    };
+
+    bool EndsWithPieces(const utils::PixelRect& oRect) const;
+
+    const DirtyBlocksStay moDirtyBlocksStay;
     GDALDatasetUniquePtr mpoDataset;
     GDALRasterBand* mpoMask = nullptr;
+    int mnPieceCols = 0;
+    int mnPieceRows = 0;
+    // Pixels that may be in dirty blocks, and how many bytes each has.
+    long long mnDirtyPixels = 0;
+    long long mnPixelBytes = 0;
 };
 
 /// Writes a finished image as another format.
