@@ -18,7 +18,9 @@ class VETRA_EXPORT BufPosDoubleArrayTfm : public IBufPosTfm {
     /// \throws ParameterException for a size below 1 or a null array.
     BufPosDoubleArrayTfm(int nNumCols, int nNumRows, const double* padfColPos,
                          const double* padfRowPos);
+    /// A copy, which refers to the same arrays.
     BufPosDoubleArrayTfm(const BufPosDoubleArrayTfm& oOther);
+    /// A copy, which refers to the same arrays.
     BufPosDoubleArrayTfm& operator=(const BufPosDoubleArrayTfm& oOther);
     ~BufPosDoubleArrayTfm() override;
 
