@@ -50,10 +50,12 @@ std::vector<float> PlainDensify(const std::vector<float>& d, int nRows, int nCol
 TEST(HostDensify, HasTheBitsOfThePlainFormula) {
     constexpr int kMost = std::numeric_limits<int>::max();
     const int aanCases[][4] = {
-        {1, 1, 1, 1},      {5, 5, 2, 2},          {4, 4, 2, 2},         {7, 9, 1, 1},
-        {1, 10, 3, 4},     {10, 1, 4, 3},         {2, 2, kMost, kMost}, {33, 70, 1, 7},
-        {65, 31, 8, 1},    {40, 1023, 7, 5},      {41, 1025, 5, 2},     {17, 3000, 4, 1024},
-        {300, 2049, 1, 2}, {9, 2500, kMost, 999}, {64, 64, 63, 63},     {64, 64, 64, 64},
+        {1, 1, 1, 1},       {5, 5, 2, 2},          {4, 4, 2, 2},         {7, 9, 1, 1},
+        {1, 10, 3, 4},      {10, 1, 4, 3},         {2, 2, kMost, kMost}, {33, 70, 1, 7},
+        {65, 31, 8, 1},     {40, 1023, 7, 5},      {41, 1025, 5, 2},     {17, 3000, 4, 1024},
+        {300, 2049, 1, 2},  {9, 2500, kMost, 999}, {64, 64, 63, 63},     {64, 64, 64, 64},
+        {3, 4097, 2, 3},    {2, 8195, 1, 4},       {4, 4200, 1, 6},      {5, 4104, 2, 8},
+        {2, 9001, 1, 5000},
     };
     const int nMaxThreads = omp_get_max_threads();
     for (const auto& [nRows, nCols, nRowStep, nColStep] : aanCases) {
