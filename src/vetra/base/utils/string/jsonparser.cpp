@@ -1,11 +1,9 @@
 #include "vetra/base/utils/string/jsonparser.h"
 
-#include <string_view>
 #include <utility>
 
 #include "vetra/base/utils/string/jsonreader.h"
 #include "vetra/base/utils/string/stringutils.h"
-#include "vetra/base/utils/string/whitespace.h"
 
 namespace vetra {
 
@@ -96,12 +94,14 @@ class JsonTree {
                                             : AsMap(oNode).mpoNextToFree;
     }
 
-    /// Puts the containers right below one at the front of the list.
+    /// Puts the containers right below one at the front of the list, and frees the values.
     static void Detach(JsonNode& oNode, JsonNode*& poFirst) {
         const auto fnDetach = [&poFirst](std::unique_ptr<JsonNode>& poChild) {
             if (IsContainer(poChild.get())) {
                 NextToFree(*poChild) = poFirst;
                 poFirst = poChild.release();
+            } else {
+                poChild.reset();
             }
         };
         if (oNode.GetType() == eJNT_LIST) {
@@ -121,15 +121,8 @@ class JsonTree {
 JsonNode::~JsonNode() = default;
 JsonNodeType JsonNode::GetType() const { return eJNT_NODE; }
 
-JsonValue::JsonValue(std::string text) {
-    std::string_view sValue = vetra::Trim(text);
-    if (vetra::IsQuoted(sValue)) {
-        sValue = sValue.substr(1, sValue.size() - 2);
-    } else if (sValue.size() == 4 && ToLower(std::string(sValue)) == "null") {
-        sValue = {};
-    }
-    msValue = sValue;
-}
+JsonValue::JsonValue() = default;
+JsonValue::JsonValue(std::string text) { vetra::JsonReader(text).Read(*this); }
 JsonNodeType JsonValue::GetType() const { return eJNT_VALUE; }
 std::string JsonValue::GetValue() const { return msValue; }
 

@@ -77,6 +77,9 @@ class VETRA_EXPORT JsonValue : public JsonNode {
     std::string GetValue() const;
 
  private:
+    friend class vetra::JsonReader;
+    JsonValue();
+
     std::string msValue;
 };
 

@@ -6,6 +6,7 @@
 #include <stdexcept>
 #include <utility>
 
+#include "vetra/base/utils/string/stringutils.h"
 #include "vetra/base/utils/string/whitespace.h"
 #include "vetra/faultcore/exceptions.h"
 
@@ -38,6 +39,9 @@ bool IsOpener(char c) { return c == '[' || c == '{' || c == '"'; }
 bool IsClosingBracket(char c) { return c == ']' || c == '}'; }
 char CloserOf(char c) { return c == '[' ? ']' : c == '{' ? '}' : '"'; }
 
+// Whether a text begins and ends with double quotes, two of them.
+bool IsQuoted(std::string_view s) { return s.size() >= 2 && s.front() == '"' && s.back() == '"'; }
+
 [[noreturn]] void Refuse(const char* pszConstructor) {
     throw Exception("Malformed JSON string", __FILE__, pszConstructor, __LINE__);
 }
@@ -54,6 +58,8 @@ std::size_t JsonReader::Finder::Find(std::size_t nStart) {
 
 JsonReader::JsonReader(std::string_view sText)
     : msText(sText), moColon(sText, ':'), moQuote(sText, '"') {}
+
+void JsonReader::Read(JsonValue& oValue) const { ReadValue(oValue, 0, msText.size()); }
 
 void JsonReader::Read(JsonList& oList) {
     Enter(oList, eJNT_LIST, 0, msText.size());
@@ -140,6 +146,15 @@ void JsonReader::ReadPair(JsonPair& oPair, std::size_t nStart, std::size_t nEnd)
     oPair.mpoNode = MakeNode(nValue, nValue + Trim(msText.substr(nValue, nEnd - nValue)).size());
 }
 
+void JsonReader::ReadValue(JsonValue& oValue, std::size_t nStart, std::size_t nEnd) const {
+    const std::string_view sValue = Trim(msText.substr(nStart, nEnd - nStart));
+    if (IsQuoted(sValue)) {
+        oValue.msValue = sValue.substr(1, sValue.size() - 2);
+    } else if (sValue.size() != 4 || ToLower(std::string(sValue)) != "null") {
+        oValue.msValue = sValue;
+    }
+}
+
 std::unique_ptr<JsonNode> JsonReader::MakeNode(std::size_t nStart, std::size_t nEnd) {
     std::unique_ptr<JsonNode> poNode;
     const char chFirst = nStart < nEnd ? msText[nStart] : '\0';
@@ -150,7 +165,9 @@ std::unique_ptr<JsonNode> JsonReader::MakeNode(std::size_t nStart, std::size_t n
         poNode.reset(new JsonMap);
         Enter(*poNode, eJNT_MAP, nStart, nEnd);
     } else {
-        poNode = std::make_unique<JsonValue>(std::string(msText.substr(nStart, nEnd - nStart)));
+        std::unique_ptr<JsonValue> poValue(new JsonValue);
+        ReadValue(*poValue, nStart, nEnd);
+        poNode = std::move(poValue);
     }
     return poNode;
 }

@@ -13,17 +13,13 @@
 // Private: what the constructors of the JSON classes do.
 namespace vetra {
 
-/// Whether a text begins and ends with double quotes, two of them.
-inline bool IsQuoted(std::string_view s) {
-    return s.size() >= 2 && s.front() == '"' && s.back() == '"';
-}
-
-/// Reads one text into an empty list, map or pair. A second read needs another reader.
+/// Reads one text into an empty value, list, map or pair. A second read needs another reader.
 class JsonReader {
  public:
     /// \param sText  must outlive the reader
     explicit JsonReader(std::string_view sText);
 
+    void Read(JsonValue& oValue) const;
     void Read(JsonList& oList);
     void Read(JsonMap& oMap);
     void Read(JsonPair& oPair);
@@ -60,6 +56,7 @@ class JsonReader {
     void ReadElement(Open& oOpen);
     void ReadEntry(Open& oOpen);
     void ReadPair(JsonPair& oPair, std::size_t nStart, std::size_t nEnd);
+    void ReadValue(JsonValue& oValue, std::size_t nStart, std::size_t nEnd) const;
     std::unique_ptr<JsonNode> MakeNode(std::size_t nStart, std::size_t nEnd);
 
     std::size_t EndOfEntry(std::size_t nStart, const Open& oOpen);
