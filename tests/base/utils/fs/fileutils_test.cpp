@@ -287,10 +287,12 @@ TEST(FileUtils, Wildcards) {
 TEST(FileUtils, DepthIsBoundByThePathAlone) {
     const ScratchFolder oScratch;
     const std::string sRoot = oScratch.GetPath();
+    // More levels than a path has room for, and than there will be descriptors.
+    const std::string sName(49, 'd');
     int nFolder = open(sRoot.c_str(), O_DIRECTORY);
-    for (int nLevel = 0; nLevel < 3000; ++nLevel) {
-        mkdirat(nFolder, "d", 0755);
-        const int nInner = openat(nFolder, "d", O_DIRECTORY);
+    for (int nLevel = 0; nLevel < 100; ++nLevel) {
+        mkdirat(nFolder, sName.c_str(), 0755);
+        const int nInner = openat(nFolder, sName.c_str(), O_DIRECTORY);
         close(openat(nInner, "f", O_CREAT | O_WRONLY, 0644));
         close(nFolder);
         nFolder = nInner;
@@ -306,13 +308,13 @@ TEST(FileUtils, DepthIsBoundByThePathAlone) {
     const Paths vsByWildcard = FindFilesByWildcard(sRoot, "f", true);
     setrlimit(RLIMIT_NOFILE, &oBefore);
 
-    // The longest path of a folder has PATH_MAX - 1 bytes, with "/d" for each level and a "/".
-    const std::size_t nLevels = (PATH_MAX - 1 - sRoot.size() - 1) / 2;
+    // The longest path of a folder has PATH_MAX - 1 bytes, with a "/" for each level and at its end.
+    const std::size_t nLevels = (PATH_MAX - 1 - sRoot.size() - 1) / (1 + sName.size());
     EXPECT_EQ(vsBySuffix.size(), nLevels);
     EXPECT_EQ(Paths(vsBySuffix.rbegin(), vsBySuffix.rend()), vsByWildcard);
 
     // Too deep for the folder's own cleaning up.
-    EXPECT_EQ(std::system(("rm -rf " + sRoot + "/d").c_str()), 0);
+    EXPECT_EQ(std::system(("rm -rf " + sRoot + "/" + sName).c_str()), 0);
 }
 
 }  // namespace
