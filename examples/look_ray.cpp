@@ -8,7 +8,7 @@
 
 int main() {
     // [camera]
-    const double kRadPerDeg = 3.14159265358979 / 180.0;
+    const double kRadPerDeg = 3.14159265358979323846 / 180.0;
     const EllipCalc oWgs84;
 
     // The camera: longitude, latitude, height.

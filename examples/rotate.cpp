@@ -36,7 +36,7 @@ int main() {
         std::vector<float> vfRows(kSize * kSize);
         float* pafCols = vfCols.data();
         float* pafRows = vfRows.data();
-        const double dfAngle = 10.0 * 3.14159265358979 / 180.0;
+        const double dfAngle = 10.0 * 3.14159265358979323846 / 180.0;
         const double dfCentre = (kSize - 1) / 2.0;
         for (int i = 0; i < kSize * kSize; ++i) {
             const double x = i % kSize - dfCentre;
