@@ -7,6 +7,7 @@
 #include <string>
 #include <vector>
 
+#include "bench/options.h"
 #include "table.h"
 #include "workload.h"
 
@@ -36,20 +37,6 @@ int main(int argc, char** argv) {
             }
         }
     }
-    std::vector<char*> vpszArguments(argv, argv + argc);
-    // Short runs in random order, so that a busy moment of the machine hits all libraries alike.
-    std::string asDefaults[] = {"--benchmark_repetitions=9",
-                                "--benchmark_enable_random_interleaving=true",
-                                "--benchmark_min_time=0.05"};
-    for (std::string& sDefault : asDefaults) {
-        vpszArguments.insert(vpszArguments.begin() + 1, sDefault.data());
-    }
-    int nCount = static_cast<int>(vpszArguments.size());
-    benchmark::Initialize(&nCount, vpszArguments.data());
-    if (benchmark::ReportUnrecognizedArguments(nCount, vpszArguments.data())) {
-        return 1;
-    }
     TableReporter oTable;
-    benchmark::RunSpecifiedBenchmarks(&oTable);
-    return 0;
+    return RunBenchmarks(argc, argv, 9, "0.05", oTable);
 }

@@ -13,6 +13,7 @@
 #include <utility>
 #include <vector>
 
+#include "bench/options.h"
 #include "vetra/vetra.h"
 
 namespace {
@@ -184,20 +185,6 @@ int main(int argc, char** argv) {
                    Type<vetra::gobs::eDT_8U, unsigned char>>();
     RegisterRaster<Type<vetra::gobs::eDT_64R, double>, Type<vetra::gobs::eDT_32R, float>>();
     RegisterMemory();
-    std::vector<char*> vpszArguments(argv, argv + argc);
-    // Short runs in random order, so that a busy moment of the machine hits all alike.
-    std::string asDefaults[] = {"--benchmark_repetitions=25",
-                                "--benchmark_enable_random_interleaving=true",
-                                "--benchmark_min_time=0.002"};
-    for (std::string& sDefault : asDefaults) {
-        vpszArguments.insert(vpszArguments.begin() + 1, sDefault.data());
-    }
-    int nCount = static_cast<int>(vpszArguments.size());
-    benchmark::Initialize(&nCount, vpszArguments.data());
-    if (benchmark::ReportUnrecognizedArguments(nCount, vpszArguments.data())) {
-        return 1;
-    }
     TableReporter oTable;
-    benchmark::RunSpecifiedBenchmarks(&oTable);
-    return 0;
+    return RunBenchmarks(argc, argv, 25, "0.002", oTable);
 }

@@ -11,6 +11,7 @@
 #include <string>
 #include <vector>
 
+#include "bench/options.h"
 #include "vetra/vetra.h"
 
 #ifdef VETRA_BENCH_EIGEN
@@ -217,20 +218,6 @@ int main(int argc, char** argv) {
 #ifdef VETRA_BENCH_EIGEN
     RegisterEigens();
 #endif
-    std::vector<char*> vpszArguments(argv, argv + argc);
-    // Short runs in random order, so that a busy moment of the machine hits both alike.
-    std::string asDefaults[] = {"--benchmark_repetitions=15",
-                                "--benchmark_enable_random_interleaving=true",
-                                "--benchmark_min_time=0.01"};
-    for (std::string& sDefault : asDefaults) {
-        vpszArguments.insert(vpszArguments.begin() + 1, sDefault.data());
-    }
-    int nCount = static_cast<int>(vpszArguments.size());
-    benchmark::Initialize(&nCount, vpszArguments.data());
-    if (benchmark::ReportUnrecognizedArguments(nCount, vpszArguments.data())) {
-        return 1;
-    }
     TableReporter oTable;
-    benchmark::RunSpecifiedBenchmarks(&oTable);
-    return 0;
+    return RunBenchmarks(argc, argv, 15, "0.01", oTable);
 }
