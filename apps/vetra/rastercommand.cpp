@@ -101,8 +101,8 @@ void AddRasterOptions(CLI::App* poCommand, RasterTexts& oTexts, RasterOptions& o
         ->expected(1)
         ->multi_option_policy(CLI::MultiOptionPolicy::TakeAll);
     AddOption(poCommand, "--threads", oOptions.nThreads, "N",
-              "Number of threads that resample, beside one that reads and one that\n"
-              "writes; all processors by default or for 0")
+              "Number of threads that resample, beside those that plan, read and\n"
+              "write; all processors by default or for 0")
         ->check(Plain(CLI::Range(0, kMostThreads)));
     AddOption(poCommand, "--memory", oOptions.nMemoryMb, "MB",
               "Memory limit of the run in megabytes, 512 by default")

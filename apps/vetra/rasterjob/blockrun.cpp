@@ -1,6 +1,7 @@
 #include "rasterjob/blockrun.h"
 
 #include <algorithm>
+#include <cstring>
 
 #include "methods.h"
 #include "rasterjob/interrupt.h"
@@ -57,6 +58,9 @@ const unsigned char* BlockRun::FillApart(const utils::ResampleBuffer& oSrc, int 
     const auto nNumPix = static_cast<std::size_t>(moMapped.oBlock.oTarget.GetNumPix());
     oInfo.meMethod = GetPlainTwin(oInfo.meMethod) == oInfo.meMethod ? eRM_NEAR : eRM_SQNEAR;
     unsigned char* pabyRequest = moOutcome.Get();
+    if (std::memchr(pabyRequest, utils::ePO_BACKGROUND, nNumPix) == nullptr) {
+        return pabyRequest;
+    }
     std::replace_if(
         pabyRequest, pabyRequest + nNumPix,
         [](unsigned char n) { return n != utils::ePO_BACKGROUND; }, utils::ePO_UNTOUCHED);

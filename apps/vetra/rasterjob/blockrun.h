@@ -29,7 +29,7 @@ class BlockRun {
  private:
     bool NeedsOutcome() const;
     // Fills the pixels that became background from their nearest pixels. Returns what became of
-    // each pixel; of those that are already computed, that they were left alone.
+    // each pixel; of those that are already computed, that they were left alone or computed.
     const unsigned char* FillApart(const utils::ResampleBuffer& oSrc, int nGroup,
                                    utils::ResampleInfo oInfo);
     void RunGroup(int nGroup);

@@ -1,11 +1,13 @@
 #include "rasterjob/pipeline.h"
 
+#include <atomic>
 #include <chrono>
 #include <condition_variable>
 #include <deque>
 #include <exception>
 #include <mutex>
 #include <thread>
+#include <vector>
 
 #include "rasterjob/interrupt.h"
 
@@ -25,18 +27,18 @@ class Pipeline {
     }
 
     void Run() {
-        std::thread oReader([&] { Serve(moPlanned, moSteps.fnRead, moRead); });
-        std::thread oWriter;
+        std::vector<std::thread> oThreads;
         try {
-            oWriter = std::thread([&] { Serve(moDone, moSteps.fnWrite, moFree); });
+            oThreads.emplace_back([&] { Plan(); });
+            oThreads.emplace_back([&] { Serve(moPlanned, moSteps.fnRead, moRead); });
+            oThreads.emplace_back([&] { Serve(moDone, moSteps.fnWrite, moFree); });
             Drive();
         } catch (...) {
             Fail();
         }
         Stop();
-        oReader.join();
-        if (oWriter.joinable()) {
-            oWriter.join();
+        for (std::thread& oThread : oThreads) {
+            oThread.join();
         }
         if (mpoFailure) {
             std::rethrow_exception(mpoFailure);
@@ -46,18 +48,37 @@ class Pipeline {
  private:
     using Queue = std::deque<int>;
 
+    void Plan() {
+        // Waiting threads of a team spin as long as there is a processor for each thread of all
+        // teams, and so take the processors from those that read and write. A second team ends that
+        // where processors are scarce.
+#pragma omp parallel
+        {}
+        Work(moFree, [&](int nSlot) -> Queue& {
+            const bool bMore = moSteps.fnPlan(nSlot);
+            mbAllPlanned = !bMore;
+            return bMore ? moPlanned : moFree;
+        });
+    }
+
     void Serve(Queue& oFrom, const std::function<void(int)>& fnStep, Queue& oTo) {
+        Work(oFrom, [&](int nSlot) -> Queue& {
+            fnStep(nSlot);
+            return oTo;
+        });
+    }
+
+    // What a thread does with the slots of a queue, until all is done.
+    template <class Step>
+    void Work(Queue& oFrom, const Step& fnStep) {
         try {
             std::unique_lock oLock(moMutex);
             for (;;) {
                 moChange.wait(oLock, [&] { return mbStop || !oFrom.empty(); });
-                if (mbStop) {
+                if (mbStop || (&oFrom == &moFree && mbAllPlanned)) {
                     return;
                 }
-                Pass(oLock, oFrom, [&](int nSlot) -> Queue& {
-                    fnStep(nSlot);
-                    return oTo;
-                });
+                Pass(oLock, oFrom, fnStep);
             }
         } catch (...) {
             Fail();
@@ -65,34 +86,24 @@ class Pipeline {
     }
 
     void Drive() {
-        bool bMore = true;
         std::unique_lock oLock(moMutex);
         for (;;) {
-            moChange.wait_for(oLock, kLookForSignals, [&] {
-                return mbStop || !moRead.empty() || (bMore && !moFree.empty()) || IsEmpty();
-            });
-            if (mbStop) {
+            moChange.wait_for(oLock, kLookForSignals,
+                              [&] { return mbStop || !moRead.empty() || IsDone(); });
+            if (mbStop || IsDone()) {
                 return;
             }
             ThrowIfInterrupted();
-            // Planning first: the reader shall never wait for a block.
-            if (bMore && !moFree.empty()) {
-                Pass(oLock, moFree, [&](int nSlot) -> Queue& {
-                    bMore = moSteps.fnPlan(nSlot);
-                    return bMore ? moPlanned : moFree;
-                });
-            } else if (!moRead.empty()) {
+            if (!moRead.empty()) {
                 Pass(oLock, moRead, [&](int nSlot) -> Queue& {
                     moSteps.fnRun(nSlot);
                     return moDone;
                 });
-            } else if (!bMore && IsEmpty()) {
-                return;
             }
         }
     }
 
-    bool IsEmpty() const { return static_cast<int>(moFree.size()) == mnSlots; }
+    bool IsDone() const { return mbAllPlanned && static_cast<int>(moFree.size()) == mnSlots; }
 
     // Takes the first slot of a queue through a step, which says where it goes then.
     template <class Step>
@@ -130,6 +141,7 @@ class Pipeline {
     Queue moPlanned;
     Queue moRead;
     Queue moDone;
+    std::atomic<bool> mbAllPlanned = false;
     bool mbStop = false;
     std::exception_ptr mpoFailure;
 };

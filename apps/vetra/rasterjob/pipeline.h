@@ -14,9 +14,9 @@ struct PipelineSteps {
     std::function<void(int)> fnWrite;
 };
 
-/// Takes blocks through four steps that overlap: reading and writing on a thread each, planning and
-/// running on the caller's, which may start a team. Every step sees the blocks in their order. No
-/// more blocks are under way than there are slots.
+/// Takes blocks through four steps that overlap: running on the caller's thread, the others on one
+/// each. Planning and running may start a team. Every step sees the blocks in their order. No more
+/// blocks are under way than there are slots.
 ///
 /// What a step throws stops all others, after the blocks that they are at, and is thrown when no
 /// thread is left; where several steps throw, the first counts.

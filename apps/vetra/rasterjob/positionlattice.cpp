@@ -71,7 +71,7 @@ void PositionLattice::Fill(const utils::PixelRect& oRect, PositionArrays& oPosit
     const int nFirstRow = oRect.nRow / kCell;
     const int nAcross = (oRect.nCol + oRect.nCols - 1) / kCell - nFirstCol + 1;
     const int nDown = (oRect.nRow + oRect.nRows - 1) / kCell - nFirstRow + 1;
-    const int nThreads = std::min(static_cast<int>(moTransformers.size()), omp_get_max_threads());
+    const int nThreads = static_cast<int>(moTransformers.size());
     std::exception_ptr poFailure;
 #pragma omp parallel for schedule(dynamic) num_threads(nThreads)
     for (int n = 0; n < nAcross * nDown; ++n) {

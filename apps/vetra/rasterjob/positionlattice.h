@@ -24,7 +24,8 @@ class PositionLattice {
     /// \param dfError       bound in source pixels; 0 for exact positions
     PositionLattice(const GeoTransformer& oTransformer, int nCols, int nRows, double dfError);
 
-    /// Positions of a rectangle's pixels, NaN for those that map nowhere. Runs on all threads.
+    /// Positions of a rectangle's pixels, NaN for those that map nowhere. Runs on as many threads
+    /// as there were when this object was made.
     void Fill(const utils::PixelRect& oRect, PositionArrays& oPositions);
 
  private:
