@@ -51,9 +51,10 @@ class Pipeline {
     void Plan() {
         // Waiting threads of a team spin as long as there is a processor for each thread of all
         // teams, and so take the processors from those that read and write. A second team ends that
-        // where processors are scarce.
+        // where processors are scarce. It must do something, or the compiler leaves it out.
+        std::atomic<int> nThreads = 0;
 #pragma omp parallel
-        {}
+        ++nThreads;
         Work(moFree, [&](int nSlot) -> Queue& {
             const bool bMore = moSteps.fnPlan(nSlot);
             mbAllPlanned = !bMore;
