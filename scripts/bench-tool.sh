@@ -1,6 +1,7 @@
 #!/usr/bin/env bash
 # Times the tool beside gdalwarp and gdal_translate on a real image, with the same target files and
-# as many threads, and prints a table: medians of runs in turn. Installs what is missing on Debian.
+# as many threads, and prints a table: medians of runs in turn. Fails when the targets' georeferences
+# differ. Installs what is missing on Debian.
 # Usage: bench-tool.sh [RUNS [THREADS]]
 set -euo pipefail
 cd "$(dirname "$0")/.."
@@ -28,6 +29,15 @@ seconds() {
 
 median() { sort -n | awk '{ v[NR] = $1 } END { printf "%.2f", (v[int((NR + 1) / 2)] + v[int(NR / 2) + 1]) / 2 }'; }
 
+# Origin and pixel size of an image, a number per line.
+georeference() { gdalinfo "$1" | sed -n 's/^\(Origin\|Pixel Size\) = (\(.*\),\(.*\))/\2\n\3/p'; }
+
+compare_georeferences() {
+    paste <(georeference "$1") <(georeference "$2") | awk '
+        { d = $1 - $2; if (d < 0) d = -d; m = $1 < 0 ? -$1 : $1; if (d > 1e-9 * m) exit 1 }
+        END { if (NR != 4) exit 1 }' || { echo "the georeferences differ" >&2; exit 1; }
+}
+
 # A line of the table: its name, then the options of both programs.
 line() {
     local name=$1 ours_options=$2 theirs_options=$3 n
@@ -40,6 +50,7 @@ line() {
         # shellcheck disable=SC2086
         seconds $theirs_options -q -co TILED=YES "$source" "$folder/b.tif" >>"$folder/theirs"
     done
+    compare_georeferences "$folder/a.tif" "$folder/b.tif"
     local ours theirs
     ours=$(median <"$folder/ours")
     theirs=$(median <"$folder/theirs")

@@ -27,7 +27,7 @@ namespace vetra::tool {
 namespace {
 
 constexpr long long kMegabyte = 1024 * 1024;
-constexpr long long kProcessBytes = 64 * kMegabyte;
+constexpr long long kProcessBytes = 80 * kMegabyte;
 // Blocks under way: one is planned, one read, one computed and one written.
 constexpr int kNumSlots = 4;
 // Time of the overviews, and of making another format from a finished image, beside that of the
