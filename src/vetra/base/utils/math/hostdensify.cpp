@@ -10,6 +10,7 @@
 #include <cstring>
 
 #include "vetra/base/utils/math/arguments.h"
+#include "vetra/threadcore/ompthreads.h"
 
 namespace vetra::utils::math {
 
@@ -258,11 +259,14 @@ void HostDensify(float* data, const int& rows, const int& cols, const int& rowSt
     const int nWidth = Strip::Width(nColStep);
     const int64_t nStrips = (nCols - 1) / nWidth + 1;
     const auto fnRow = [=](int nRow) { return data + std::ptrdiff_t{nRow} * nCols; };
+    // The last strip may be a narrow one, so every thread gets a share of each.
+    const int64_t nPieces = nRows * nStrips;
+    const int64_t nChunk = std::clamp<int64_t>(nPieces / (16 * OMPGetMaxThreads()), 1, 64);
 #pragma omp parallel
     {
         Strip oStrip;
-#pragma omp for schedule(static)
-        for (int64_t nPiece = 0; nPiece < nRows * nStrips; ++nPiece) {
+#pragma omp for schedule(static, nChunk)
+        for (int64_t nPiece = 0; nPiece < nPieces; ++nPiece) {
             const int nFirstCol = static_cast<int>(nPiece / nRows) * nWidth;
             if (nFirstCol != oStrip.FirstCol()) {
                 oStrip.SetColumns(nFirstCol, nCols, nColStep);
