@@ -308,7 +308,8 @@ TEST(FileUtils, DepthIsBoundByThePathAlone) {
     const Paths vsByWildcard = FindFilesByWildcard(sRoot, "f", true);
     setrlimit(RLIMIT_NOFILE, &oBefore);
 
-    // The longest path of a folder has PATH_MAX - 1 bytes, with a "/" for each level and at its end.
+    // The longest path of a folder has PATH_MAX - 1 bytes, with a "/" for each level and at its
+    // end.
     const std::size_t nLevels = (PATH_MAX - 1 - sRoot.size() - 1) / (1 + sName.size());
     EXPECT_EQ(vsBySuffix.size(), nLevels);
     EXPECT_EQ(Paths(vsBySuffix.rbegin(), vsBySuffix.rend()), vsByWildcard);

@@ -104,8 +104,8 @@ struct Lagrange8Filter {
         return Select(onNode, node, value);
     }
 
-    // x times the distances to node kFirst and those behind it. Compilers don't unroll the loop, and
-    // what goes through memory is slow.
+    // x times the distances to node kFirst and those behind it. Compilers don't unroll the loop,
+    // and what goes through memory is slow.
     template <int kFirst>
     static F64 Times(F64 x, const F64 (&distance)[kTaps]) {
         if constexpr (kFirst < kTaps) {
