@@ -295,6 +295,28 @@ inline F64 LoadSamples(const T* p) {
     }
 }
 
+// The second of two loads ends with the last sample.
+template <int kStep, typename T>
+inline F64 LoadEvery(const T* p) {
+    constexpr int kLoad = 16;
+    constexpr int kSecond = (kLanes - 1) * kStep + 1 - kLoad;
+    static_assert(sizeof(T) == 1 && kSecond > 0 && kSecond <= kLoad);
+    // An index with the highest bit gives 0.
+    alignas(kLoad) signed char aFirst[kLoad];
+    alignas(kLoad) signed char aSecond[kLoad];
+    for (int i = 0; i < kLoad; ++i) {
+        const int nPlace = i * kStep;
+        aFirst[i] = static_cast<signed char>(i < kLanes && nPlace < kLoad ? nPlace : -1);
+        aSecond[i] =
+            static_cast<signed char>(i < kLanes && nPlace >= kLoad ? nPlace - kSecond : -1);
+    }
+    const auto fnPick = [&](const T* q, const signed char* pIndex) {
+        return _mm_shuffle_epi8(_mm_loadu_si128(reinterpret_cast<const __m128i*>(q)),
+                                _mm_load_si128(reinterpret_cast<const __m128i*>(pIndex)));
+    };
+    return FromInt32(Widen<T>(_mm_or_si128(fnPick(p, aFirst), fnPick(p + kSecond, aSecond))));
+}
+
 template <typename T>
 inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {
     const __m128i v =

@@ -185,6 +185,15 @@ inline F64 LoadSamples(const T* p) {
     }
     return a;
 }
+template <int kStep, typename T>
+inline F64 LoadEvery(const T* p) {
+    F64 a;
+    for (int i = 0; i < kParts; ++i) {
+        a.v[i] = Pair{static_cast<double>(p[2 * i * kStep]),
+                      static_cast<double>(p[(2 * i + 1) * kStep])};
+    }
+    return a;
+}
 
 template <typename T>
 inline void ShufflePairs(const T* p, const unsigned char* pabyPlace, F64& a, F64& b) {

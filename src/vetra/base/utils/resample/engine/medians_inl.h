@@ -47,6 +47,14 @@ inline typename Vectors<nBytes>::Elements LoadLanes(const T* p) {
     return __builtin_convertvector(v, typename Vectors<nBytes>::Elements);
 }
 
+template <int nBytes, typename T>
+inline void StoreLanes(T* p, typename Vectors<nBytes>::Elements v) {
+    typedef typename Lanes<sizeof(T)>::Element Narrow;
+    typedef Narrow Packed __attribute__((vector_size(kElements<nBytes> * sizeof(T))));
+    const Packed packed = __builtin_convertvector(v, Packed) ^ static_cast<Narrow>(kMoved<T>);
+    __builtin_memcpy(p, &packed, sizeof packed);
+}
+
 template <typename Vector>
 inline void SortPair(Vector& a, Vector& b) {
     const Vector least = a < b ? a : b;
@@ -91,6 +99,60 @@ inline Vector SelectOfFew(int nCount, const Samples& fnSample) {
     return aHeld[0];
 }
 
+// The same for a number of samples that the compiler knows, all in registers.
+template <int i, int j, typename Vector>
+inline void SortMirrored(Vector* pHeld) {
+    if constexpr (i < j) {
+        SortPair(pHeld[i], pHeld[j]);
+        SortMirrored<i + 1, j - 1>(pHeld);
+    }
+}
+template <int i, int kEnd, typename Vector>
+inline void LeastToFront(Vector* pHeld) {
+    if constexpr (i < kEnd) {
+        SortPair(pHeld[0], pHeld[i]);
+        LeastToFront<i + 1, kEnd>(pHeld);
+    }
+}
+template <int i, int kLast, typename Vector>
+inline void GreatestToBack(Vector* pHeld) {
+    if constexpr (i < kLast) {
+        SortPair(pHeld[i], pHeld[kLast]);
+        GreatestToBack<i + 1, kLast>(pHeld);
+    }
+}
+template <int kHeld, int kNext, int kCount, typename Vector, typename Samples>
+inline Vector SelectHeld(Vector* pHeld, const Samples& fnSample) {
+    if constexpr (kHeld == 1) {
+        return pHeld[0];
+    } else {
+        SortMirrored<0, kHeld - 1>(pHeld);
+        LeastToFront<1, (kHeld + 1) / 2>(pHeld);
+        GreatestToBack<kHeld / 2, kHeld - 1>(pHeld);
+        if constexpr (kNext < kCount) {
+            pHeld[0] = fnSample(kNext);
+            return SelectHeld<kHeld - 1, kNext + 1, kCount>(pHeld, fnSample);
+        } else {
+            return SelectHeld<kHeld - 2, kNext, kCount>(pHeld + 1, fnSample);
+        }
+    }
+}
+template <int kSize, typename T, int nBytes>
+inline typename Vectors<nBytes>::Elements SelectOfSquare(const void* const* papRow,
+                                                         std::int64_t nFirst) {
+    constexpr int kCount = kSize * kSize;
+    static_assert(kCount % 2 == 1);
+    constexpr int kHeld = kCount / 2 + 2;
+    const auto fnSample = [&](int i) {
+        return LoadLanes<nBytes>(static_cast<const T*>(papRow[i / kSize]) + nFirst + i % kSize);
+    };
+    typename Vectors<nBytes>::Elements aHeld[kHeld];
+    for (int i = 0; i < kHeld; ++i) {
+        aHeld[i] = fnSample(i);
+    }
+    return SelectHeld<kHeld, kHeld, kCount>(aHeld, fnSample);
+}
+
 // The same for more samples, of kBits bits, as many as an element can count: bit by bit, the
 // greatest number that has no more samples below it than the rank says.
 template <int nBytes, int kBits, typename Samples>
@@ -115,9 +177,17 @@ inline typename Vectors<nBytes>::Elements SelectOfMany(int nCount, const Samples
 }
 
 // Medians of kElements<nBytes> pixels; rows begin at the first pixel's windows.
-template <typename T, int nBytes, bool kSquared>
+template <typename T, int nBytes>
 inline void MedianBlock(const void* const* papRow, std::int64_t nFirst, const WindowSize& oSize,
-                        double* padfValue) {
+                        T* pMedian) {
+    if (oSize.nCols == 3 && oSize.nRows == 3) {
+        StoreLanes<nBytes>(pMedian, SelectOfSquare<3, T, nBytes>(papRow, nFirst));
+        return;
+    }
+    if (oSize.nCols == 5 && oSize.nRows == 5) {
+        StoreLanes<nBytes>(pMedian, SelectOfSquare<5, T, nBytes>(papRow, nFirst));
+        return;
+    }
     typedef typename Vectors<nBytes>::Elements Elements;
     const int nCount = oSize.nCols * oSize.nRows;
     int nRow = 0;
@@ -137,26 +207,14 @@ inline void MedianBlock(const void* const* papRow, std::int64_t nFirst, const Wi
     };
     // By the number of operations, of which a bit needs three for each sample.
     constexpr int kFew = sizeof(T) == 1 ? 12 : kMostFew;
-    const Elements median =
-        nCount <= kFew ? SelectOfFew<Elements>(nCount, fnSample)
-                       : SelectOfMany<nBytes, 8 * static_cast<int>(sizeof(T))>(nCount, fnSample);
-    typename Lanes<nBytes>::Element aMedian[kElements<nBytes>];
-    __builtin_memcpy(aMedian, &median, sizeof aMedian);
-    for (int i = 0; i < kElements<nBytes>; ++i) {
-        padfValue[i] = static_cast<double>(static_cast<int>(aMedian[i]) + kMoved<T>);
-    }
-    if constexpr (kSquared) {
-        // The root of the median is the median of the roots.
-        for (int i = 0; i < kElements<nBytes>; i += kLanes) {
-            const F64 root = Root(Load(padfValue + i));
-            Store(padfValue + i, root * root);
-        }
-    }
+    StoreLanes<nBytes>(
+        pMedian, nCount <= kFew
+                     ? SelectOfFew<Elements>(nCount, fnSample)
+                     : SelectOfMany<nBytes, 8 * static_cast<int>(sizeof(T))>(nCount, fnSample));
 }
 
-template <typename T, int nBytes, bool kSquared>
-inline void MediansWith(const MedianRows& oRows, const WindowSize& oSize, int nPix,
-                        double* padfValue) {
+template <typename T, int nBytes>
+inline void MediansWith(const MedianRows& oRows, const WindowSize& oSize, int nPix, T* pMedian) {
     constexpr int kCount = kElements<nBytes>;
     static_assert(kCount <= kMedianReach);
     if (nPix < kCount) {
@@ -168,27 +226,28 @@ inline void MediansWith(const MedianRows& oRows, const WindowSize& oSize, int nP
             oRows.papCopy[k] = pCopy;
             pCopy += oSize.nCols + kMedianReach;
         }
-        double adfValue[kCount];
-        MedianBlock<T, nBytes, kSquared>(oRows.papCopy, 0, oSize, adfValue);
-        __builtin_memcpy(padfValue, adfValue, static_cast<std::size_t>(nPix) * sizeof(double));
+        T aMedian[kCount];
+        MedianBlock<T, nBytes>(oRows.papCopy, 0, oSize, aMedian);
+        __builtin_memcpy(pMedian, aMedian, static_cast<std::size_t>(nPix) * sizeof(T));
         return;
     }
     for (int i = 0; i < nPix; i += kCount) {
         // The last block overlaps the one before rather than the end of the rows.
         const int nFirst = i + kCount <= nPix ? i : nPix - kCount;
-        MedianBlock<T, nBytes, kSquared>(oRows.papRow, nFirst, oSize, padfValue + nFirst);
+        MedianBlock<T, nBytes>(oRows.papRow, nFirst, oSize, pMedian + nFirst);
     }
 }
 
-template <typename T, bool kSquared>
+template <typename T>
 VETRA_STAGE void Medians(const MedianRows& oRows, const WindowSize& oSize, int nPix,
-                         double* padfValue) {
+                         void* pMedians) {
+    T* pMedian = static_cast<T*>(pMedians);
     constexpr int kMostOfBytes = 255;
     if constexpr (sizeof(T) == 1) {
         if (oSize.nCols * oSize.nRows <= kMostOfBytes) {
-            MediansWith<T, 1, kSquared>(oRows, oSize, nPix, padfValue);
+            MediansWith<T, 1>(oRows, oSize, nPix, pMedian);
             return;
         }
     }
-    MediansWith<T, 2, kSquared>(oRows, oSize, nPix, padfValue);
+    MediansWith<T, 2>(oRows, oSize, nPix, pMedian);
 }

@@ -33,8 +33,7 @@ RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTabl
         moFacts.poRows = &oStages.aoRows[RowIndex(oMethod)];
     }
     mbSquared = oMethod.eValues % 2 == 1;
-    moFacts.pfnMedians =
-        (mbSquared ? oStages.apfnSquaredMedians : oStages.apfnMedians)[oTask.nSrcType];
+    moFacts.pfnMedians = oStages.apfnMedians[oTask.nSrcType];
     mpadfFracCol = oColumns.vdfFrac.data();
     // Strips are made for nothing where no rows are kept however they lie.
     moPath = ChoosePath(oTask, moFacts);
@@ -255,25 +254,28 @@ void RowCache::MoveSums(std::int64_t nSrcRow) {
     }
 }
 
-// Medians for the target columns whose windows fit.
-void RowCache::ComputeMedians(int nFirstCol, int nNumCols) {
+unsigned char* RowCache::GetMedians(int nFirstCol, int nNumCols) {
     const int nFirst = std::max(nFirstCol, moStrip.nFitFirst);
     const int nLast = std::min(nFirstCol + nNumCols, moStrip.nFitFirst + moStrip.nFitCount);
-    if (nFirst >= nLast) {
-        return;
+    if (nFirst < nLast) {
+        const std::ptrdiff_t nBytes = kSampleBytes[moTask.nSrcType];
+        for (std::size_t k = 0; k < mnRows; ++k) {
+            mvpRow[k] = SrcSamples(mnWindowRow + static_cast<std::int64_t>(k), 0) +
+                        (nFirst - moStrip.nFitFirst) * nBytes;
+        }
+        moPlan.moFacts.pfnMedians({mvpRow.data(), mpabyCopy.get(), mvpCopy.data()},
+                                  *static_cast<const WindowSize*>(moTask.pParameters),
+                                  nLast - nFirst, mabyMedian + (nFirst - nFirstCol) * nBytes);
     }
-    for (std::size_t k = 0; k < mnRows; ++k) {
-        mvpRow[k] = SrcSamples(mnWindowRow + static_cast<std::int64_t>(k), 0) +
-                    std::ptrdiff_t{nFirst - moStrip.nFitFirst} * kSampleBytes[moTask.nSrcType];
-    }
-    moPlan.moFacts.pfnMedians({mvpRow.data(), mpabyCopy.get(), mvpCopy.data()},
-                              *static_cast<const WindowSize*>(moTask.pParameters), nLast - nFirst,
-                              madfValue + (nFirst - nFirstCol));
+    return mabyMedian;
 }
 
 double* RowCache::GetValues(int nChannel, int nFirstCol, int nNumCols) {
     if (moPlan.moPath.ePath == Path::eMedians) {
-        ComputeMedians(nFirstCol, nNumCols);
+        const LevelStages& oStages = *moPlan.mpoStages;
+        const auto& apfnWiden =
+            moPlan.mbSquared ? oStages.apfnWidenSquaredRoots : oStages.apfnWiden;
+        apfnWiden[moTask.nSrcType](GetMedians(nFirstCol, nNumCols), 1, nNumCols, madfValue);
         return madfValue;
     }
     // Whole groups of the strip.

@@ -64,11 +64,13 @@ class RowCache {
     /// at most kSpanPixels. Those of pixels whose windows don't fit mean nothing. They may be
     /// overwritten, up to kLanes behind the last one, and last until the next call.
     double* GetValues(int nChannel, int nFirstCol, int nNumCols);
+    /// On the path of the medians, the medians of one channel's samples, in the source's type; for
+    /// a method that isn't squared they are its values. Otherwise as above.
+    unsigned char* GetMedians(int nFirstCol, int nNumCols);
 
  private:
     void Fetch(std::int64_t nSrcRow, std::size_t nSlot);
     void MoveSums(std::int64_t nSrcRow);
-    void ComputeMedians(int nFirstCol, int nNumCols);
     const char* SrcSamples(std::int64_t nSrcRow, int nChannel) const;
 
     const Task& moTask;
@@ -88,6 +90,7 @@ class RowCache {
     std::unique_ptr<char[]> mpabyCopy;  // for medians
     std::vector<const void*> mvpRow;
     std::vector<const void*> mvpCopy;
+    alignas(64) unsigned char mabyMedian[2 * kSpanArray] = {};
     alignas(64) double madfValue[kSpanArray + kLanes] = {};
 };
 

@@ -2,22 +2,53 @@
 // filter each of them along the columns once, for all the target rows that need it. Included inside
 // a level's namespace; see stages_inl.h.
 
-// A stretch of one channel of a source row as doubles, or as their roots.
-template <typename T, bool kRoots>
+// Samples of one channel, eight pixels at a time.
+class ChannelReader {
+ public:
+    explicit ChannelReader(int nChan) : mnChan(nChan) {
+        for (int i = 0; i < kLanes; ++i) {
+            manOffset[i] = static_cast<std::int64_t>(i) * nChan;
+        }
+    }
+
+    template <typename T>
+    F64 Read(const T* p) const {
+        if (mnChan == 1) {
+            return LoadSamples(p);
+        }
+        if constexpr (sizeof(T) == 1) {
+            if (mnChan == 3) {
+                return LoadEvery<3>(p);
+            }
+            if (mnChan == 4) {
+                return LoadEvery<4>(p);
+            }
+        }
+        return Gather(p, manOffset);
+    }
+
+ private:
+    int mnChan;
+    std::int64_t manOffset[kLanes];
+};
+
+// A stretch of one channel of a source row as doubles, as their roots, or as the squares of those.
+enum class Widened { eSamples, eRoots, eSquaredRoots };
+template <typename T, Widened eWidened>
 VETRA_STAGE void Widen(const void* pSrc, int nChan, std::int64_t nCount, double* padf) {
     const T* p = static_cast<const T*>(pSrc);
-    std::int64_t anOffset[kLanes];
-    for (int i = 0; i < kLanes; ++i) {
-        anOffset[i] = static_cast<std::int64_t>(i) * nChan;
-    }
-    const auto fnRoot = [](F64 v) { return kRoots ? Root(v) : v; };
+    const ChannelReader oReader(nChan);
+    const auto fnWidened = [](F64 v) {
+        const F64 root = eWidened == Widened::eSamples ? v : Root(v);
+        return eWidened == Widened::eSquaredRoots ? root * root : root;
+    };
     std::int64_t n = 0;
     for (; n + kLanes <= nCount; n += kLanes, p += static_cast<std::int64_t>(nChan) * kLanes) {
-        Store(padf + n, fnRoot(nChan == 1 ? LoadSamples(p) : Gather(p, anOffset)));
+        Store(padf + n, fnWidened(oReader.Read(p)));
     }
     for (; n < nCount; ++n, p += nChan) {
         double adf[kLanes];
-        Store(adf, fnRoot(Set1(static_cast<double>(*p))));
+        Store(adf, fnWidened(Set1(static_cast<double>(*p))));
         padf[n] = adf[0];
     }
 }

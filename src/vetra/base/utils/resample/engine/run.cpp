@@ -68,6 +68,9 @@ Run::Run(const Task& oTask)
             moColumns = MakeColumnTables(oTask, moStages, moPositions, moLimits,
                                          mbOpen ? &moModes : nullptr);
             moRowPlan = RowPlan(oTask, moStages, moColumns);
+            mbMediansAreSamples = moRowPlan.GetPath().ePath == Path::eMedians &&
+                                  moMethod.eValues == eVR_MEDIAN &&
+                                  oTask.nSrcType == oTask.nTgtType;
         }
     }
     if (oTask.oOptions.poTaken != nullptr) {

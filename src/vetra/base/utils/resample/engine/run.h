@@ -140,10 +140,10 @@ class Run {
     void Deliver(const Span& oSpan, int nChannel, const unsigned char* pabySample) const;
     template <typename Function>
     void WithSampleBits(const Function& fnDo) const;
-    template <typename Bits>
     void AddBackground(const Span& oSpan, void* pSamples) const;
     void CopyRuns(const Span& oSpan) const;
     void Copy(const Span& oSpan, int nBegin, int nEnd) const;
+    void Clamp(void* pSamples, std::int64_t nSamples) const;
     void FillBackground(long long nFirst, int nPix) const;
 
     const char* SrcRow(long long nRow) const {
@@ -170,6 +170,8 @@ class Run {
     int mnTgtBytes;
     // Samples go from source to target as they are; null where they pass through a double.
     CopyFunction mpfnCopy = nullptr;
+    // The medians of a row cache are values in the target's type.
+    bool mbMediansAreSamples = false;
     // Makes the values of mnChannels channels at once; null where that depends on the span.
     ValuesFunction mpfnPixels = nullptr;
     int mnChannels;

@@ -48,6 +48,13 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
         CopyRuns(oSpan);
         return;
     }
+    if (mbMediansAreSamples && oSpan.poRows != nullptr && (oSpan.nModes & kSetNearest) == 0) {
+        unsigned char* pabySample = oSpan.poRows->GetMedians(oSpan.nFirstCol, oSpan.nPix);
+        Clamp(pabySample, oSpan.nPix);
+        AddBackground(oSpan, pabySample);
+        Deliver(oSpan, 0, pabySample);
+        return;
+    }
     const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
     WindowSpan oWindows;
     oWindows.panOffset = oSpan.panWindow;
@@ -126,9 +133,7 @@ void Run::MakeSamples(const Span& oSpan, int nChannel, double* padfValue,
                                      padfValue);
     }
     moStages.apfnStore[moTask.nTgtType](padfValue, oSpan.nPix, moTask.pLimits, pabySample);
-    if ((oSpan.nModes & kSetBackground) != 0) {
-        WithSampleBits([&](auto nBits) { AddBackground<decltype(nBits)>(oSpan, pabySample); });
-    }
+    AddBackground(oSpan, pabySample);
 }
 
 // Calls a function with a number as large as a target sample.
@@ -150,20 +155,25 @@ void Run::WithSampleBits(const Function& fnDo) const {
     }
 }
 
-template <typename Bits>
+// Puts the background among the samples of one channel.
 void Run::AddBackground(const Span& oSpan, void* pSamples) const {
-    Bits background;
-    std::memcpy(&background, moTask.pBackground, sizeof background);
-    // Copies that no store can reach.
-    const unsigned char* __restrict pabyMode = oSpan.pabyMode;
-    auto* __restrict pabySample = static_cast<unsigned char*>(pSamples);
-    const auto nPix = static_cast<std::size_t>(oSpan.nPix);
-    for (std::size_t i = 0; i < nPix; ++i) {
-        Bits sample;
-        std::memcpy(&sample, pabySample + i * sizeof(Bits), sizeof sample);
-        sample = pabyMode[i] == ePO_BACKGROUND ? background : sample;
-        std::memcpy(pabySample + i * sizeof(Bits), &sample, sizeof sample);
+    if ((oSpan.nModes & kSetBackground) == 0) {
+        return;
     }
+    WithSampleBits([&](auto nBits) {
+        decltype(nBits) background;
+        std::memcpy(&background, moTask.pBackground, sizeof background);
+        // Copies that no store can reach.
+        const unsigned char* __restrict pabyMode = oSpan.pabyMode;
+        auto* __restrict pabySample = static_cast<unsigned char*>(pSamples);
+        const auto nPix = static_cast<std::size_t>(oSpan.nPix);
+        for (std::size_t i = 0; i < nPix; ++i) {
+            decltype(nBits) sample;
+            std::memcpy(&sample, pabySample + i * sizeof sample, sizeof sample);
+            sample = pabyMode[i] == ePO_BACKGROUND ? background : sample;
+            std::memcpy(pabySample + i * sizeof sample, &sample, sizeof sample);
+        }
+    });
 }
 
 // Writes one channel of a span, but where a pixel stays untouched.
@@ -205,8 +215,7 @@ void Run::CopyRuns(const Span& oSpan) const {
             return;
         }
         if (moTask.nChan == 1) {
-            WithSampleBits(
-                [&](auto nBits) { AddBackground<decltype(nBits)>(oSpan, TgtPixel(oSpan.nFirst)); });
+            AddBackground(oSpan, TgtPixel(oSpan.nFirst));
             return;
         }
         for (int nBegin = 0; nBegin < oSpan.nPix;) {
@@ -236,9 +245,13 @@ void Run::CopyRuns(const Span& oSpan) const {
 void Run::Copy(const Span& oSpan, int nBegin, int nEnd) const {
     char* pTgt = TgtPixel(oSpan.nFirst + nBegin);
     mpfnCopy(oSpan.pNearestSrc, oSpan.panNearest + nBegin, nEnd - nBegin, moTask.nChan, pTgt);
+    Clamp(pTgt, static_cast<std::int64_t>(nEnd - nBegin) * moTask.nChan);
+}
+
+// Clamps samples of an integer type that took no way through a double.
+void Run::Clamp(void* pSamples, std::int64_t nSamples) const {
     if (!moTask.bClampIsOpen) {
-        moStages.apfnClamp[moTask.nTgtType](
-            pTgt, static_cast<std::int64_t>(nEnd - nBegin) * moTask.nChan, moTask.pLimits);
+        moStages.apfnClamp[moTask.nTgtType](pSamples, nSamples, moTask.pLimits);
     }
 }
 

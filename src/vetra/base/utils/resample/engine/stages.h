@@ -232,9 +232,9 @@ using RowValuesFunction = void (*)(const RowWindows& oRows, double* padfValue);
 /// another away: nCount samples, nChan apart.
 using AddRowFunction = void (*)(const void* pAdd, const void* pSubtract, int nChan,
                                 std::int64_t nCount, double* padfSum);
-/// Computes the medians of nPix windows at unit scale.
+/// Computes the medians of nPix windows at unit scale, as samples.
 using MediansFunction = void (*)(const MedianRows& oRows, const WindowSize& oSize, int nPix,
-                                 double* padfValue);
+                                 void* pMedians);
 /// Reads the samples at panOffset of the pixels whose mode is 2.
 using NearestFunction = void (*)(const void* pSrc, const std::int64_t* panOffset,
                                  const unsigned char* pabyMode, int nPix, double* padfValue);
@@ -363,9 +363,10 @@ struct LevelStages {
     void (*pfnAddUp)(const double* padfSum, std::int64_t nCount, double* padfTotal);
     RowValuesFunction pfnSumValues;
     RowValuesFunction pfnTotalValues;
-    /// Medians, and squared ones; null for most types.
+    /// Medians, and what their squared twins make of them: the root of the median is the median of
+    /// the roots. Null for most types.
     MediansFunction apfnMedians[kNumSampleTypes];
-    MediansFunction apfnSquaredMedians[kNumSampleTypes];
+    WidenFunction apfnWidenSquaredRoots[kNumSampleTypes];
     /// By the half of a row's number, which it shares with its squared twin.
     RowStages aoRows[(kNumValues - 1) / 2];
     NearestFunction apfnNearest[kNumSampleTypes];

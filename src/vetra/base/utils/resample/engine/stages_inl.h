@@ -30,6 +30,7 @@
 //   GatherNear                   doubles at eight offsets and a shift below kNearColumns, together
 //                                below kNearReach
 //   LoadSamples                  eight adjacent samples
+//   LoadEvery                    eight 8-bit samples, three or four apart
 //   CopySamples                  samples at eight offsets, as they are (integers of up to 32 bits)
 //   StoreSamples                 eight values that T can hold (float: rounds to nearest)
 
@@ -105,11 +106,11 @@ namespace {
 #define VETRA_TWINS(Name, Method) \
     VETRA_PER_TYPE(VETRA_VALUES, Method, ), VETRA_PER_TYPE(VETRA_VALUES, Squared<Method>, ),
 #define VETRA_ROWS(Name, Method) RowStagesOf<Method>::kStages,
-#define VETRA_WIDEN(T) &Widen<T, false>
-#define VETRA_WIDEN_ROOTS(T) &Widen<T, true>
+#define VETRA_WIDEN(T) &Widen<T, Widened::eSamples>
+#define VETRA_WIDEN_ROOTS(T) &Widen<T, Widened::eRoots>
+#define VETRA_WIDEN_SQUARED_ROOTS(T) &Widen<T, Widened::eSquaredRoots>
 #define VETRA_ADD_ROW(T) &AddRow<T>
-#define VETRA_MEDIANS(T) &Medians<T, false>
-#define VETRA_SQUARED_MEDIANS(T) &Medians<T, true>
+#define VETRA_MEDIANS(T) &Medians<T>
 #define VETRA_NEAREST(T) &NearestValues<T, false>
 #define VETRA_NONNEGATIVE(T) &NearestValues<T, true>
 #define VETRA_STORE(T) &StoreValues<T>
@@ -145,7 +146,7 @@ const LevelStages kStages = {
     &SumValues,
     &TotalValues,
     VETRA_PER_SMALL_INTEGER(VETRA_MEDIANS),
-    VETRA_PER_SMALL_INTEGER(VETRA_SQUARED_MEDIANS),
+    VETRA_PER_SMALL_INTEGER(VETRA_WIDEN_SQUARED_ROOTS),
     {VETRA_VALUES_ROWS(VETRA_ROWS)},
     VETRA_PER_TYPE(VETRA_NEAREST),
     VETRA_PER_TYPE(VETRA_NONNEGATIVE),

@@ -8,18 +8,12 @@
 template <typename T, bool kAdd, bool kSubtract>
 inline void ChangeSums(const T* pAdd, const T* pSubtract, int nChan, std::int64_t nCount,
                        double* padfSum) {
-    std::int64_t anOffset[kLanes];
-    for (int i = 0; i < kLanes; ++i) {
-        anOffset[i] = static_cast<std::int64_t>(i) * nChan;
-    }
-    const auto fnSamples = [&](const T* p) {
-        return nChan == 1 ? LoadSamples(p) : Gather(p, anOffset);
-    };
+    const ChannelReader oReader(nChan);
     std::int64_t n = 0;
     for (; n + kLanes <= nCount; n += kLanes) {
         F64 sum = Load(padfSum + n);
-        sum = kAdd ? sum + fnSamples(pAdd + n * nChan) : sum;
-        sum = kSubtract ? sum - fnSamples(pSubtract + n * nChan) : sum;
+        sum = kAdd ? sum + oReader.Read(pAdd + n * nChan) : sum;
+        sum = kSubtract ? sum - oReader.Read(pSubtract + n * nChan) : sum;
         Store(padfSum + n, sum);
     }
     for (; n < nCount; ++n) {
