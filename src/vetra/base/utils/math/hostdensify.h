@@ -21,7 +21,8 @@ namespace vetra::utils::math {
 /// threads. All four samples count, also those with a factor of 0: an infinity or NaN among them
 /// gives NaN.
 ///
-/// Runs on all OpenMP threads. The time is linear in the size of the grid.
+/// Runs on all OpenMP threads where there are rows enough, and takes memory for two rows of the grid
+/// per thread then. The time is linear in the size of the grid.
 ///
 /// \param data     [rows x cols], row after row
 /// \param rows     number of rows; below 1 there is nothing to do
@@ -30,6 +31,7 @@ namespace vetra::utils::math {
 /// \param colStep  distance of known columns, at least 1
 /// \throws ParameterException for \p cols, \p rowStep or \p colStep below 1, and for a null
 ///         \p data where there are rows; nothing is changed.
+/// \throws std::bad_alloc where there is no memory for the rows; nothing is changed.
 VETRA_EXPORT void HostDensify(float* data, const int& rows, const int& cols, const int& rowStep,
                               const int& colStep);
 

@@ -13,7 +13,7 @@ foreach(object IN LISTS OBJECTS)
     # Plain C functions of the C library's memory and mathematics may be called.
     list(FILTER symbols EXCLUDE REGEX "^U (mem[a-z]+|_GLOBAL_OFFSET_TABLE_|__stack_chk_fail)$")
     list(LENGTH symbols count)
-    if(NOT count EQUAL 1 OR NOT symbols MATCHES "^[DR] _ZN.*${level}7k(Stages|Passes)E$")
+    if(NOT count EQUAL 1 OR NOT symbols MATCHES "^[DR] _ZN.*${level}(7kStages|7kPasses|5kRows)E$")
         message(FATAL_ERROR "level ${level} has other symbols than its functions: ${symbols}")
     endif()
 endforeach()

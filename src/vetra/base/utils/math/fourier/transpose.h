@@ -9,8 +9,11 @@
 // Private: transposition of samples, in place.
 namespace vetra::utils::math::fourier {
 
-/// Rows that are transposed together: as many samples as a cache line holds.
-constexpr std::ptrdiff_t kBandRows = 8;
+/// Samples of a tile's side: as many as a cache line holds.
+constexpr std::ptrdiff_t kTile = 8;
+/// Rows that are transposed together: with few rows, most of what a tile takes is a look for its
+/// pages; with many, their cache lines have no room beside each other.
+constexpr std::ptrdiff_t kBandRows = 32;
 
 inline void SwapSamples(float* pafA, float* pafB) {
     std::uint64_t a;
@@ -22,24 +25,24 @@ inline void SwapSamples(float* pafA, float* pafB) {
 }
 
 /// Swaps the samples (i, j) and (j, i) of a square array of n x n samples, for all j < i where i is
-/// in band nBand, in tiles whose cache lines stay in the cache.
+/// in band nBand, in squares as high as the band, and those in tiles.
 ///
 /// \param fnRow  gives the start of a row, as floats
 template <typename GetRow>
 inline void TransposeBand(std::ptrdiff_t n, std::ptrdiff_t nBand, const GetRow& fnRow) {
     const std::ptrdiff_t nFirst = nBand * kBandRows;
     const std::ptrdiff_t nEnd = std::min(n, nFirst + kBandRows);
-    for (std::ptrdiff_t nTile = 0; nTile < nFirst; nTile += kBandRows) {
-        for (std::ptrdiff_t i = nFirst; i < nEnd; ++i) {
-            float* pafRow = fnRow(i);
-            for (std::ptrdiff_t j = nTile; j < nTile + kBandRows; ++j) {
-                SwapSamples(pafRow + 2 * j, fnRow(j) + 2 * i);
+    for (std::ptrdiff_t nSquare = 0; nSquare <= nFirst; nSquare += kBandRows) {
+        for (std::ptrdiff_t nRow = nFirst; nRow < nEnd; nRow += kTile) {
+            const std::ptrdiff_t nSquareEnd = std::min(nRow + kTile, nSquare + kBandRows);
+            for (std::ptrdiff_t nCol = nSquare; nCol < nSquareEnd; nCol += kTile) {
+                for (std::ptrdiff_t i = nRow; i < std::min(nEnd, nRow + kTile); ++i) {
+                    float* pafRow = fnRow(i);
+                    for (std::ptrdiff_t j = nCol; j < std::min(i, nCol + kTile); ++j) {
+                        SwapSamples(pafRow + 2 * j, fnRow(j) + 2 * i);
+                    }
+                }
             }
-        }
-    }
-    for (std::ptrdiff_t i = nFirst; i < nEnd; ++i) {
-        for (std::ptrdiff_t j = nFirst; j < i; ++j) {
-            SwapSamples(fnRow(i) + 2 * j, fnRow(j) + 2 * i);
         }
     }
 }

@@ -198,12 +198,21 @@ class ClassWriter {
     static constexpr int kWord = 64;
 
     void Write(int i) {
-        const std::uint64_t nBoth = mnFits & mnNear;
-        const std::uint64_t anClass[4] = {~(mnFits | mnNear), mnFits ^ nBoth, mnNear ^ nBoth,
-                                          nBoth};
-        const int nRest = mnPix - i;
+        // Mostly all pixels are of one class, and those behind the last one may be what they like.
         const std::uint64_t nExist =
-            nRest < kWord ? (std::uint64_t{1} << nRest) - 1 : ~std::uint64_t{0};
+            mnPix - i < kWord ? (std::uint64_t{1} << (mnPix - i)) - 1 : ~std::uint64_t{0};
+        const std::uint64_t nFits = mnFits & nExist;
+        const std::uint64_t nNear = mnNear & nExist;
+        mnFits = 0;
+        mnNear = 0;
+        if ((nFits == 0 || nFits == nExist) && (nNear == 0 || nNear == nExist)) {
+            const int nClass = (nFits != 0 ? kClassFits : 0) | (nNear != 0 ? kClassNear : 0);
+            __builtin_memset(mpaby + i, mabyWritten[nClass], kWord);
+            manFound[nClass] = 1;
+            return;
+        }
+        const std::uint64_t nBoth = nFits & nNear;
+        const std::uint64_t anClass[4] = {~(nFits | nNear), nFits ^ nBoth, nNear ^ nBoth, nBoth};
         std::uint64_t nBits0 = 0;
         std::uint64_t nBits1 = 0;
         for (int k = 0; k < 4; ++k) {
@@ -212,8 +221,6 @@ class ClassWriter {
             manFound[k] |= anClass[k] & nExist;
         }
         StoreBits(mpaby + i, nBits0, nBits1);
-        mnFits = 0;
-        mnNear = 0;
     }
 
     int mnPix;

@@ -122,7 +122,10 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
       mnRows(static_cast<std::size_t>(moMethod.oWindow.nRows)) {
     const std::size_t nChan = static_cast<std::size_t>(oTask.nChan);
     const std::size_t nWndCols = static_cast<std::size_t>(moMethod.oWindow.nCols);
-    const std::size_t nSamples = static_cast<std::size_t>(oPlan.moFacts.nStripSrcCols) + kNearReach;
+    // Each row begins on a whole group.
+    const std::size_t nSamples =
+        (static_cast<std::size_t>(oPlan.moFacts.nStripSrcCols) + kNearReach) / kLanes * kLanes +
+        kLanes;
     const std::size_t nStripCols = static_cast<std::size_t>(oPlan.moFacts.nStripCols) + kLanes;
     mnRowDoubles = nSamples;
     switch (oPlan.moPath.ePath) {
@@ -134,11 +137,12 @@ RowCache::RowCache(const Task& oTask, const RowPlan& oPlan)
             return;
         case Path::eSums:
             // Per channel the sums of the columns, and those added up.
+            mnRowDoubles += kLanes;
             mpadfKept = MakeAlignedDoubles(nChan * 2 * mnRowDoubles);
             mvpadfRow.resize(nChan);
             for (std::size_t c = 0; c < nChan; ++c) {
-                mvpadfRow[c] =
-                    mpadfKept.get() + (2 * c + (SumsAddUp(moMethod) ? 1 : 0)) * mnRowDoubles;
+                double* padfSum = mpadfKept.get() + 2 * c * mnRowDoubles;
+                mvpadfRow[c] = SumsAddUp(moMethod) ? Totals(padfSum) : padfSum;
             }
             break;
         case Path::eFilteredRows:
@@ -249,7 +253,7 @@ void RowCache::MoveSums(std::int64_t nSrcRow) {
             fnChange(nSrcRow, mnWindowRow, nSrcRow + nRows, mnWindowRow + nRows);
         }
         if (SumsAddUp(moMethod)) {
-            oStages.pfnAddUp(padfSum, moStrip.nSrcCount, padfSum + mnRowDoubles);
+            oStages.pfnAddUp(padfSum, moStrip.nSrcCount, Totals(padfSum));
         }
     }
 }

@@ -72,6 +72,8 @@ class RowCache {
     void Fetch(std::int64_t nSrcRow, std::size_t nSlot);
     void MoveSums(std::int64_t nSrcRow);
     const char* SrcSamples(std::int64_t nSrcRow, int nChannel) const;
+    // Sums from the left begin with a 0, behind which whole groups begin.
+    double* Totals(double* padfSum) const { return padfSum + mnRowDoubles + kLanes - 1; }
 
     const Task& moTask;
     const RowPlan& moPlan;
