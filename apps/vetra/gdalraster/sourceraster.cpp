@@ -72,6 +72,10 @@ SourceRaster::SourceRaster(const std::string& sPath, const std::optional<NodataV
     GdalMessages::ForgetFailures();
     // A raw file that is too short would else be filled up with zeros.
     const CPLConfigOptionSetter oCheckSize("RAW_CHECK_FILE_SIZE", "YES", true);
+    // Blocks of an image are read about once each: its pixels need no stay in GDAL's cache, where
+    // GDAL can do without. But what comes over a network is better read once.
+    const bool bLocal = sPath.compare(0, 4, "/vsi") != 0;
+    const CPLConfigOptionSetter oPastCache("GTIFF_DIRECT_IO", bLocal ? "YES" : nullptr, true);
     mpoDataset.reset(GDALDataset::Open(sPath.c_str(), GDAL_OF_RASTER | GDAL_OF_VERBOSE_ERROR));
     if (!mpoDataset) {
         // Most drivers name the file themselves.

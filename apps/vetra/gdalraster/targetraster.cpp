@@ -3,6 +3,8 @@
 #include <cpl_conv.h>
 #include <cpl_string.h>
 
+#include <algorithm>
+
 #include "gdalraster/description.h"
 #include "gdalraster/errors.h"
 #include "gdalraster/pixeltypes.h"
@@ -12,6 +14,8 @@ namespace vetra::tool {
 namespace {
 
 constexpr const char* kCannotCreate = "can't create the target";
+// So many are written to the file at once, if there is no need to write fewer.
+constexpr long long kFewestBytes = 2 * 1024 * 1024;
 
 }  // namespace
 
@@ -79,10 +83,13 @@ void TargetRaster::Write(const utils::PixelRect& oRect, BandArrays& oArrays,
                           oRect.nCols, oRect.nRows, GDT_Byte, 0, 0, nullptr) != CE_None) {
         GdalMessages::Throw(GetWriteFailure());
     }
-    // Whole pieces are best: a part would be read back and written a second time.
+    // Soon, while other steps of the run are at work. Whole pieces are best: a part would be read
+    // back and written a second time.
     mnDirtyPixels += oRect.GetNumPix();
     const long long nMostPixels = GDALGetCacheMax64() / 2 / mnPixelBytes;
-    if (mnDirtyPixels > nMostPixels || (mnDirtyPixels > nMostPixels / 2 && EndsWithPieces(oRect))) {
+    if (mnDirtyPixels > nMostPixels ||
+        (mnDirtyPixels > std::min(nMostPixels / 2, kFewestBytes / mnPixelBytes) &&
+         EndsWithPieces(oRect))) {
         mnDirtyPixels = 0;
         for (GDALRasterBand* poBand : mpoDataset->GetBands()) {
             poBand->FlushCache(false);

@@ -162,6 +162,16 @@ TEST_F(ToolTest, AKilledRunLeavesNoWholeImage) {
     constexpr int kKills = 6;
     std::random_device oRandom;
     int nKilled = 0;
+    // Most kills come before the end of a run on this machine.
+    unsigned anRunTime[3];
+    for (int n = 0; n < 3; ++n) {
+        const auto oStart = std::chrono::steady_clock::now();
+        EXPECT_EQ(Run(std::string("resample a.tif b.tif --scale=1 -q ") + apszExtra[n]).sErr, "");
+        const std::chrono::duration<double, std::milli> oTime =
+            std::chrono::steady_clock::now() - oStart;
+        anRunTime[n] = static_cast<unsigned>(oTime.count());
+        fs::remove(Path("b.tif"));
+    }
     for (int n = 0; n < kKills; ++n) {
         const pid_t nChild = fork();
         ASSERT_GE(nChild, 0);
@@ -170,7 +180,7 @@ TEST_F(ToolTest, AKilledRunLeavesNoWholeImage) {
                   "--scale=1", "-q", apszExtra[n % 3], static_cast<char*>(nullptr));
             _exit(127);
         }
-        const unsigned nDelay = oRandom() % 400;
+        const unsigned nDelay = oRandom() % (anRunTime[n % 3] * 3 / 4 + 1);
         std::this_thread::sleep_for(std::chrono::milliseconds(nDelay));
         kill(nChild, SIGKILL);
         int nStatus = 0;
