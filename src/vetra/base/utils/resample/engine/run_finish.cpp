@@ -72,7 +72,10 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
     if (oSpan.pabyBroken != nullptr) {
         Pack(oSpan, oBroken);
     }
-    const bool bInterleave = mbInterleaves && (oSpan.nModes & kSetUntouched) == 0;
+    const bool bAll = (oSpan.nModes & kSetUntouched) == 0;
+    const bool bInterleave = mbInterleaves && bAll;
+    // Samples are made in whole groups.
+    const bool bInPlace = moTask.nChan == 1 && bAll && oSpan.nPix % kLanes == 0;
     ValuesFunction pfnValues = mpfnPixels;
     if (bWindows && pfnValues == nullptr) {
         pfnValues = moStages.apfnValues[oSpan.eValues][moTask.nSrcType];
@@ -89,12 +92,14 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
             ReplaceBroken(oSpan, nChannel, oWindows, oBroken, padfValue);
         }
         for (int i = 0; i < mnChannels; ++i) {
-            unsigned char* pabySample = oValues.abySample;
+            unsigned char* pabySample =
+                bInPlace ? reinterpret_cast<unsigned char*>(TgtPixel(oSpan.nFirst))
+                         : oValues.abySample;
             if (bInterleave) {
                 pabySample += std::ptrdiff_t{nChannel + i} * kSpanArray * mnTgtBytes;
             }
             MakeSamples(oSpan, nChannel + i, padfValue + i * kSpanArray, pabySample);
-            if (!bInterleave) {
+            if (!bInterleave && !bInPlace) {
                 Deliver(oSpan, nChannel + i, pabySample);
             }
         }
