@@ -52,7 +52,13 @@ std::vector<float> PlainDensify(const std::vector<float>& d, int nRows, int nCol
 
 TEST(HostDensify, HasTheBitsOfThePlainFormula) {
     constexpr int kMost = std::numeric_limits<int>::max();
-    const int aanCases[][4] = {
+    struct Case {
+        int nRows;
+        int nCols;
+        int nRowStep;
+        int nColStep;
+    };
+    const Case aoCases[] = {
         {1, 1, 1, 1},       {5, 5, 2, 2},          {4, 4, 2, 2},         {7, 9, 1, 1},
         {1, 10, 3, 4},      {10, 1, 4, 3},         {2, 2, kMost, kMost}, {33, 70, 1, 7},
         {65, 31, 8, 1},     {40, 1023, 7, 5},      {41, 1025, 5, 2},     {17, 3000, 4, 1024},
@@ -61,7 +67,8 @@ TEST(HostDensify, HasTheBitsOfThePlainFormula) {
         {2, 9001, 1, 5000}, {200, 130, 7, 6},      {100, 90, 90, 7},     {160, 45, 64, 5},
     };
     const int nMaxThreads = omp_get_max_threads();
-    for (const auto& [nRows, nCols, nRowStep, nColStep] : aanCases) {
+    for (const Case& o : aoCases) {
+        const auto [nRows, nCols, nRowStep, nColStep] = o;
         std::mt19937 oRandom(static_cast<unsigned>(nRows * nCols));
         std::uniform_real_distribution<float> oUniform(-1.0f, 1.0f);
         std::vector<float> vfData(static_cast<std::size_t>(nRows * nCols));
@@ -75,8 +82,8 @@ TEST(HostDensify, HasTheBitsOfThePlainFormula) {
                 // Which of several NaN comes out depends on the processor.
                 if (!(std::isnan(vfOurs[i]) && std::isnan(vfPlain[i])) &&
                     std::memcmp(&vfOurs[i], &vfPlain[i], sizeof(float)) != 0) {
-                    ADD_FAILURE() << nRows << " x " << nCols << " by " << nRowStep << ", "
-                                  << nColStep << ": sample " << i;
+                    ADD_FAILURE() << o.nRows << " x " << o.nCols << " by " << o.nRowStep << ", "
+                                  << o.nColStep << ": sample " << i;
                     return;
                 }
             }
