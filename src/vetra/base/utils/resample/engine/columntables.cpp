@@ -39,22 +39,33 @@ std::vector<PairGroup> MakePairGroups(const Task& oTask, const ColumnTables& oCo
 std::vector<BitGroup> MakeBitGroups(const ColumnTables& oColumns,
                                     const std::vector<std::int64_t>& vnPlace, unsigned char nClass,
                                     int nCols) {
-    std::vector<BitGroup> voGroups(static_cast<std::size_t>(nCols) / kLanes + 1);
+    constexpr int kBitsInByte = 8;
+    std::vector<BitGroup> voGroups(static_cast<std::size_t>(nCols + BitGroup::kColumns - 1) /
+                                   BitGroup::kColumns);
     const std::int64_t* panPlace = vnPlace.data();
     const unsigned char* pabyClass = oColumns.vbyClass.data();
+    int nLeft = nCols;
     for (BitGroup& oGroup : voGroups) {
-        const auto [itFirst, itLast] = std::minmax_element(panPlace, panPlace + kLanes);
-        oGroup.nFirst = *itLast - *itFirst < BitGroup::kReach ? *itFirst : -1;
-        for (int i = 0; i < kLanes && oGroup.nFirst >= 0; ++i) {
-            oGroup.abyShift[i] =
-                static_cast<unsigned char>(BitGroup::kReach - 1 - (panPlace[i] - oGroup.nFirst));
+        const int nGroupCols = std::min(nLeft, BitGroup::kColumns);
+        Reach oBytes;
+        for (int i = 0; i < nGroupCols; ++i) {
+            if ((pabyClass[i] & nClass) != 0) {
+                oGroup.nInside |= std::uint32_t{1} << i;
+                oBytes.Add(panPlace[i] / kBitsInByte);
+            }
         }
-        for (int i = 0; i < kLanes; ++i) {
-            const int nBit = (pabyClass[i] & nClass) != 0 ? 1 << i : 0;
-            oGroup.nInside = static_cast<unsigned char>(oGroup.nInside | nBit);
+        const bool bClose = oBytes.nLast - oBytes.nFirst < BitGroup::kBytes;
+        oGroup.nFirst = bClose ? oBytes.nFirst : -1;
+        for (int i = 0; i < nGroupCols; ++i) {
+            if ((oGroup.nInside >> i & 1u) != 0) {
+                oGroup.abyBit[i] = static_cast<unsigned char>(1 << panPlace[i] % kBitsInByte);
+                oGroup.abyPlace[i] = static_cast<unsigned char>(
+                    bClose ? panPlace[i] / kBitsInByte - oBytes.nFirst : 0);
+            }
         }
-        panPlace += kLanes;
-        pabyClass += kLanes;
+        panPlace += nGroupCols;
+        pabyClass += nGroupCols;
+        nLeft -= nGroupCols;
     }
     return voGroups;
 }

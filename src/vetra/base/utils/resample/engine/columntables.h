@@ -38,7 +38,7 @@ struct ColumnTables {
     std::vector<unsigned char> avbyMode[4];
     // One for every eight columns, where pairs of 8-bit samples can be picked out of a row.
     std::vector<PairGroup> voGroups;
-    // The same for the bits of a masked source's windows and nearest pixels.
+    // One for every BitGroup::kColumns columns, of a masked source's windows and nearest pixels.
     std::vector<BitGroup> voWholeGroups;
     std::vector<BitGroup> voUsableGroups;
 };

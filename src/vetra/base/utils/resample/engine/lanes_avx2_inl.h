@@ -39,6 +39,9 @@ inline F64 Select(B64 m, F64 a, F64 b) {
     return {_mm256_blendv_pd(b.lo, a.lo, m.lo), _mm256_blendv_pd(b.hi, a.hi, m.hi)};
 }
 
+inline F64 Least(F64 a, F64 b) { return {_mm256_min_pd(a.lo, b.lo), _mm256_min_pd(a.hi, b.hi)}; }
+inline F64 Greatest(F64 a, F64 b) { return {_mm256_max_pd(a.lo, b.lo), _mm256_max_pd(a.hi, b.hi)}; }
+
 inline F64 ZeroWhere(B64 m, F64 a) {
     return {_mm256_andnot_pd(m.lo, a.lo), _mm256_andnot_pd(m.hi, a.hi)};
 }
@@ -156,13 +159,4 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
 
 inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
     return Gather(p + nShift, o);
-}
-
-inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
-    return PickBits(panMap, panPlace);
-}
-inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
-    std::int64_t anPlace[kLanes];
-    StoreIntegers(anPlace, place);
-    return PickBits(panMap, anPlace);
 }

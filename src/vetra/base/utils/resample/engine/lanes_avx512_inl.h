@@ -19,6 +19,9 @@ inline B64 operator==(F64 a, F64 b) { return {_mm512_cmp_pd_mask(a.v, b.v, _CMP_
 inline B64 operator&(B64 a, B64 b) { return {static_cast<__mmask8>(a.m & b.m)}; }
 inline F64 Select(B64 m, F64 a, F64 b) { return {_mm512_mask_blend_pd(m.m, b.v, a.v)}; }
 
+inline F64 Least(F64 a, F64 b) { return {_mm512_min_pd(a.v, b.v)}; }
+inline F64 Greatest(F64 a, F64 b) { return {_mm512_max_pd(a.v, b.v)}; }
+
 inline F64 ZeroWhere(B64 m, F64 a) {
     return {_mm512_maskz_mov_pd(static_cast<__mmask8>(~m.m), a.v)};
 }
@@ -103,15 +106,3 @@ inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
 }
 
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
-
-inline unsigned MapBits(const std::uint64_t* panMap, __m512i vPlace) {
-    const __m256i vWords = _mm512_i64gather_epi32(_mm512_srli_epi64(vPlace, 5), panMap, 4);
-    const __m256i vBit = _mm256_and_si256(_mm512_cvtepi64_epi32(vPlace), _mm256_set1_epi32(31));
-    return _mm256_test_epi32_mask(_mm256_srlv_epi32(vWords, vBit), _mm256_set1_epi32(1));
-}
-inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
-    return MapBits(panMap, _mm512_loadu_si512(panPlace));
-}
-inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
-    return MapBits(panMap, _mm512_cvttpd_epi64(place.v));
-}

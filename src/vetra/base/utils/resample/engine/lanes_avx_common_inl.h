@@ -389,6 +389,14 @@ inline __m256i SpreadBits(std::uint32_t nBits, unsigned char nByte) {
     return _mm256_and_si256(_mm256_cmpeq_epi8(_mm256_and_si256(vEight, vOwn), vOwn),
                             _mm256_set1_epi8(static_cast<char>(nByte)));
 }
+inline void AddBits(unsigned char* p, std::uint64_t nBits, unsigned char nByte) {
+    for (int i = 0; i < 64; i += 32) {
+        auto* q = reinterpret_cast<__m256i*>(p + i);
+        _mm256_storeu_si256(
+            q, _mm256_or_si256(_mm256_loadu_si256(q),
+                               SpreadBits(static_cast<std::uint32_t>(nBits >> i), nByte)));
+    }
+}
 inline void StoreBits(unsigned char* p, std::uint64_t nBits0, std::uint64_t nBits1) {
     for (int i = 0; i < 64; i += 32) {
         _mm256_storeu_si256(
@@ -398,13 +406,62 @@ inline void StoreBits(unsigned char* p, std::uint64_t nBits0, std::uint64_t nBit
     }
 }
 
-inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
-    std::uint64_t nBits;
-    __builtin_memcpy(&nBits, reinterpret_cast<const char*>(panMap) + oGroup.nFirst / 8,
-                     sizeof nBits);
-    const __m256i v = _mm256_set1_epi32(static_cast<int>(nBits >> (oGroup.nFirst % 8)));
-    const __m256i vShift =
-        _mm256_cvtepu8_epi32(_mm_loadl_epi64(reinterpret_cast<const __m128i*>(oGroup.abyShift)));
-    return static_cast<unsigned>(
-        _mm256_movemask_ps(_mm256_castsi256_ps(_mm256_sllv_epi32(v, vShift))));
+inline std::uint32_t GroupBits(const std::uint64_t* panRow, const BitGroup& oGroup,
+                               const std::int64_t* panCol) {
+    if (oGroup.nFirst < 0) {
+        return PickGroupBits(panRow, oGroup, panCol);
+    }
+    const auto fnTable = [](const unsigned char* p) {
+        return _mm256_loadu_si256(reinterpret_cast<const __m256i*>(p));
+    };
+    const __m128i vRow = _mm_loadu_si128(
+        reinterpret_cast<const __m128i*>(reinterpret_cast<const char*>(panRow) + oGroup.nFirst));
+    const __m256i vByte =
+        _mm256_shuffle_epi8(_mm256_broadcastsi128_si256(vRow), fnTable(oGroup.abyPlace));
+    const __m256i vNot =
+        _mm256_cmpeq_epi8(_mm256_and_si256(vByte, fnTable(oGroup.abyBit)), _mm256_setzero_si256());
+    return ~static_cast<std::uint32_t>(_mm256_movemask_epi8(vNot));
+}
+
+// Mostly the eight pixels lie in two bands and sixteen columns, from the first or the last of them
+// on: then two loads have all bits.
+inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch, F64 col, F64 row) {
+    const __m256i vCol = ToInt32(col);
+    const __m256i vRow = ToInt32(row);
+    const auto fnLesserEnd = [](__m256i v) {
+        return _mm256_min_epi32(_mm256_broadcastd_epi32(_mm256_castsi256_si128(v)),
+                                _mm256_permutevar8x32_epi32(v, _mm256_set1_epi32(kLanes - 1)));
+    };
+    const __m256i vFirstCol = fnLesserEnd(vCol);
+    const __m256i vFirstRow =
+        _mm256_and_si256(fnLesserEnd(vRow), _mm256_set1_epi32(~(kBandRows - 1)));
+    const __m256i vCols = _mm256_sub_epi32(vCol, vFirstCol);
+    const __m256i vRows = _mm256_sub_epi32(vRow, vFirstRow);
+    static_assert(kBandReach == 16 && 2 * kBandRows == 16);
+    if (_mm256_testz_si256(_mm256_or_si256(vCols, vRows), _mm256_set1_epi32(~15)) == 0) {
+        alignas(32) std::int32_t anCol[kLanes];
+        alignas(32) std::int32_t anRow[kLanes];
+        _mm256_store_si256(reinterpret_cast<__m256i*>(anCol), vCol);
+        _mm256_store_si256(reinterpret_cast<__m256i*>(anRow), vRow);
+        return PickBandBits(pabyMap, nPitch, anCol, anRow);
+    }
+    const auto fnLower = [](__m256i v) {
+        return std::int64_t{_mm_cvtsi128_si32(_mm256_castsi256_si128(v))};
+    };
+    static_assert(kBandRows == 1 << 3);
+    const unsigned char* p = pabyMap + (fnLower(vFirstRow) >> 3) * nPitch + fnLower(vFirstCol);
+    const auto fnBand = [](const unsigned char* q) {
+        return _mm_loadu_si128(reinterpret_cast<const __m128i*>(q));
+    };
+    const __m128i vPlace = Narrow8<false>(vCols);
+    const __m128i vShift = Narrow8<false>(vRows);
+    // Bits of the rows of either band.
+    const __m128i vUpper = _mm_set_epi64x(0, static_cast<long long>(0x8040201008040201u));
+    const __m128i vLower = _mm_set_epi64x(static_cast<long long>(0x8040201008040201u), 0);
+    const __m128i vFound = _mm_or_si128(
+        _mm_and_si128(_mm_shuffle_epi8(fnBand(p), vPlace), _mm_shuffle_epi8(vUpper, vShift)),
+        _mm_and_si128(_mm_shuffle_epi8(fnBand(p + nPitch), vPlace),
+                      _mm_shuffle_epi8(vLower, vShift)));
+    const int nNot = _mm_movemask_epi8(_mm_cmpeq_epi8(vFound, _mm_setzero_si128()));
+    return ~static_cast<unsigned>(nNot) & 0xffu;
 }

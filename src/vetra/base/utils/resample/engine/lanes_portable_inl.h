@@ -46,6 +46,9 @@ inline F64 Select(B64 m, F64 a, F64 b) {
     return a;
 }
 
+inline F64 Least(F64 a, F64 b) { return Select(a < b, a, b); }
+inline F64 Greatest(F64 a, F64 b) { return Select(a > b, a, b); }
+
 inline F64 ZeroWhere(B64 m, F64 a) {
     for (int i = 0; i < kParts; ++i) {
         a.v[i] = reinterpret_cast<Pair>(reinterpret_cast<PairMask>(a.v[i]) & ~m.m[i]);
@@ -241,24 +244,19 @@ inline void StoreBits(unsigned char* p, std::uint64_t nBits0, std::uint64_t nBit
         p[i] = static_cast<unsigned char>((nBits0 >> i & 1u) | (nBits1 >> i & 1u) << 1);
     }
 }
-inline unsigned GroupBits(const std::uint64_t* panMap, const BitGroup& oGroup) {
-    const std::uint64_t* p = panMap + oGroup.nFirst / 64;
-    const int nShift = static_cast<int>(oGroup.nFirst % 64);
-    std::uint64_t n = p[0] >> nShift;
-    if (nShift != 0) {
-        n |= p[1] << (64 - nShift);
+inline void AddBits(unsigned char* p, std::uint64_t nBits, unsigned char nByte) {
+    for (int i = 0; i < 64; ++i) {
+        p[i] = static_cast<unsigned char>(p[i] | ((nBits >> i & 1u) != 0 ? nByte : 0));
     }
-    unsigned nBits = 0;
-    for (int i = 0; i < kLanes; ++i) {
-        nBits |= (static_cast<std::uint32_t>(n) << oGroup.abyShift[i]) >> 31 << i;
-    }
-    return nBits;
 }
-inline unsigned MapBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
-    return PickBits(panMap, panPlace);
+inline std::uint32_t GroupBits(const std::uint64_t* panRow, const BitGroup& oGroup,
+                               const std::int64_t* panCol) {
+    return PickGroupBits(panRow, oGroup, panCol);
 }
-inline unsigned MapBits(const std::uint64_t* panMap, F64 place) {
-    std::int64_t anPlace[kLanes];
-    StoreIntegers(anPlace, place);
-    return PickBits(panMap, anPlace);
+inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch, F64 col, F64 row) {
+    std::int64_t anCol[kLanes];
+    std::int64_t anRow[kLanes];
+    StoreIntegers(anCol, col);
+    StoreIntegers(anRow, row);
+    return PickBandBits(pabyMap, nPitch, anCol, anRow);
 }

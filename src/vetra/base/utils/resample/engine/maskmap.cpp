@@ -32,21 +32,31 @@ void Erode(std::uint64_t* panRow, std::int64_t nWords, std::int64_t nNumBits) {
 
 }  // namespace
 
-MaskMap::MaskMap(const Task& oTask, const LevelStages& oStages)
+MaskMap::MaskMap(const Task& oTask, const LevelStages& oStages, bool bBands)
     : moTask(oTask),
       moStages(oStages),
+      mbBands(bBands),
       mnRowWords((std::int64_t{oTask.nSrcCols} + kWordBits - 1) / kWordBits),
-      mnBlockRows(std::max<std::int64_t>(kLeastBlockRows, oTask.poMethod->oWindow.nRows)),
+      // Whole bands.
+      mnBlockRows(
+          (std::max<std::int64_t>(kLeastBlockRows, oTask.poMethod->oWindow.nRows) + kBandRows - 1) /
+          kBandRows * kBandRows),
       mnBlocksAcross((mnRowWords + kBlockWords - 1) / kBlockWords),
       mnScratchRows(mnBlockRows + oTask.poMethod->oWindow.nRows - 1),
       mnScratchWords(kBlockWords +
                      (std::int64_t{oTask.poMethod->oWindow.nCols} + kWordBits - 2) / kWordBits) {
-    // Pages that nobody writes to take no memory. The bits of a group are read as two words.
+    // Pages that nobody writes to take no memory. Groups of bits are read beyond the last one, and
+    // so are bands, with the band below.
+    const std::int64_t nBands = (oTask.nSrcRows + kBandRows - 1) / kBandRows + 1;
+    const std::int64_t nRows = bBands ? nBands * kBandRows : oTask.nSrcRows;
+    static_assert(BitGroup::kBytes == kBandReach);
     mpanBits.reset(static_cast<std::uint64_t*>(std::calloc(
-        static_cast<std::size_t>(2 * mnRowWords * oTask.nSrcRows + 1), sizeof(std::uint64_t))));
+        static_cast<std::size_t>(2 * mnRowWords * nRows) + kBandReach / sizeof(std::uint64_t),
+        sizeof(std::uint64_t))));
     const std::int64_t nBlocksDown = (oTask.nSrcRows + mnBlockRows - 1) / mnBlockRows;
     mvbMade.resize(static_cast<std::size_t>(mnBlocksAcross * nBlocksDown));
     mvnScratch.resize(static_cast<std::size_t>(mnScratchRows * mnScratchWords));
+    mvnUsable.resize(static_cast<std::size_t>(mnBlockRows * kBlockWords));
 }
 
 bool MaskMap::Provide(const Reach& oCols, const Reach& oRows) {
@@ -79,16 +89,14 @@ void MaskMap::MakeBlock(std::int64_t nBlockRow, std::int64_t nBlockCol) {
     const bool bExactlyOne = moTask.poMethod->eRule == ModeRule::eWindow;
     const std::int64_t nBlockWords = std::min(kBlockWords, mnRowWords - nBlockCol * kBlockWords);
     const std::int64_t nNumRows = std::min(mnScratchRows, moTask.nSrcRows - nFirstRow);
-    const auto fnBits = [&](std::int64_t nRow) {
-        return mpanBits.get() + 2 * (nFirstRow + nRow) * mnRowWords + nBlockCol * kBlockWords;
-    };
+    const std::int64_t nBlockRows = std::min(mnBlockRows, nNumRows);
     for (std::int64_t r = 0; r < nNumRows; ++r) {
         std::uint64_t* panRow = panRows + r * mnScratchWords;
         const unsigned char* pabyMask =
             moTask.pabySrcMask + (nFirstRow + r) * moTask.nSrcCols + nFirstCol;
         moStages.pfnMaskBits(pabyMask, nCount, 0, false, panRow);
-        if (r < mnBlockRows) {
-            std::uint64_t* panUsable = fnBits(r) + mnRowWords;
+        if (r < nBlockRows) {
+            std::uint64_t* panUsable = mvnUsable.data() + r * kBlockWords;
             if (bExactlyOne) {
                 moStages.pfnMaskBits(pabyMask, std::min(nCount, nBlockWords * kWordBits), 1, true,
                                      panUsable);
@@ -107,8 +115,29 @@ void MaskMap::MakeBlock(std::int64_t nBlockRow, std::int64_t nBlockCol) {
         }
         nDone += nShift;
     }
-    for (std::int64_t r = 0; r < std::min(mnBlockRows, nNumRows); ++r) {
-        std::copy_n(panRows + r * mnScratchWords, nBlockWords, fnBits(r));
+    const std::int64_t nFirstWord = nBlockCol * kBlockWords;
+    Keep(panRows, mnScratchWords, false, nFirstRow, nBlockRows, nFirstWord, nBlockWords);
+    Keep(mvnUsable.data(), kBlockWords, true, nFirstRow, nBlockRows, nFirstWord, nBlockWords);
+}
+
+// Puts a block's bits where they belong.
+void MaskMap::Keep(const std::uint64_t* panRows, std::int64_t nRowWords, bool bUsable,
+                   std::int64_t nFirstRow, std::int64_t nNumRows, std::int64_t nFirstWord,
+                   std::int64_t nNumWords) {
+    if (!mbBands) {
+        for (std::int64_t r = 0; r < nNumRows; ++r) {
+            std::copy_n(panRows + r * nRowWords, nNumWords,
+                        mpanBits.get() + (2 * (nFirstRow + r) + (bUsable ? 1 : 0)) * mnRowWords +
+                            nFirstWord);
+        }
+        return;
+    }
+    for (std::int64_t r = 0; r < nNumRows; r += kBandRows) {
+        moStages.pfnMakeBand(panRows + r * nRowWords, nRowWords,
+                             static_cast<int>(std::min<std::int64_t>(kBandRows, nNumRows - r)),
+                             nNumWords,
+                             BandStart((nFirstRow + r) / kBandRows) +
+                                 ((bUsable ? mnRowWords : 0) + nFirstWord) * kWordBits);
     }
 }
 

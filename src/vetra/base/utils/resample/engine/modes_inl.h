@@ -85,54 +85,52 @@ VETRA_STAGE void Classes(const ClassLimits& oClassLimits, std::int64_t nPitch,
     }
 }
 
-inline F64 Least(F64 a, F64 b) { return Select(a < b, a, b); }
-inline double LeastOf(F64 a) {
-    double adf[kLanes];
-    Store(adf, a);
-    for (int i = 1; i < kLanes; ++i) {
-        adf[0] = adf[i] < adf[0] ? adf[i] : adf[0];
-    }
-    return adf[0];
-}
-
 VETRA_STAGE PositionBounds Bounds(const double* padfCol, const double* padfRow, int nPix) {
     F64 firstCol = Set1(__builtin_inf());
     F64 firstRow = firstCol;
-    // With their signs changed.
-    F64 lastCol = firstCol;
-    F64 lastRow = firstCol;
-    const F64 zero = Set1(0.0);
-    for (int i = 0; i + kLanes <= nPix; i += kLanes) {
+    F64 lastCol = Set1(-__builtin_inf());
+    F64 lastRow = lastCol;
+    int i = 0;
+    for (; i + kLanes <= nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
         firstCol = Least(col, firstCol);
         firstRow = Least(row, firstRow);
-        lastCol = Least(zero - col, lastCol);
-        lastRow = Least(zero - row, lastRow);
+        lastCol = Greatest(col, lastCol);
+        lastRow = Greatest(row, lastRow);
     }
-    PositionBounds o{LeastOf(firstCol), -LeastOf(lastCol), LeastOf(firstRow), -LeastOf(lastRow)};
-    for (int i = nPix / kLanes * kLanes; i < nPix; ++i) {
-        o.dfFirstCol = padfCol[i] < o.dfFirstCol ? padfCol[i] : o.dfFirstCol;
-        o.dfLastCol = padfCol[i] > o.dfLastCol ? padfCol[i] : o.dfLastCol;
-        o.dfFirstRow = padfRow[i] < o.dfFirstRow ? padfRow[i] : o.dfFirstRow;
-        o.dfLastRow = padfRow[i] > o.dfLastRow ? padfRow[i] : o.dfLastRow;
+    double aadf[4][kLanes];
+    Store(aadf[0], firstCol);
+    Store(aadf[1], lastCol);
+    Store(aadf[2], firstRow);
+    Store(aadf[3], lastRow);
+    PositionBounds o{aadf[0][0], aadf[1][0], aadf[2][0], aadf[3][0]};
+    const auto fnAdd = [&](double dfFirstCol, double dfLastCol, double dfFirstRow,
+                           double dfLastRow) {
+        o.dfFirstCol = dfFirstCol < o.dfFirstCol ? dfFirstCol : o.dfFirstCol;
+        o.dfLastCol = dfLastCol > o.dfLastCol ? dfLastCol : o.dfLastCol;
+        o.dfFirstRow = dfFirstRow < o.dfFirstRow ? dfFirstRow : o.dfFirstRow;
+        o.dfLastRow = dfLastRow > o.dfLastRow ? dfLastRow : o.dfLastRow;
+    };
+    for (int k = 1; k < kLanes; ++k) {
+        fnAdd(aadf[0][k], aadf[1][k], aadf[2][k], aadf[3][k]);
+    }
+    for (; i < nPix; ++i) {
+        fnAdd(padfCol[i], padfCol[i], padfRow[i], padfRow[i]);
     }
     return o;
 }
 
 // Which of the windows of eight pixels hold no mask byte of 0.
-inline unsigned WholeBits(const MaskWindow& oWindow, const std::int64_t* panWindow) {
-    if (oWindow.panWhole != nullptr) {
-        return MapBits(oWindow.panWhole, panWindow);
-    }
+inline unsigned WholeBits(const MaskBytes& oMask, const std::int64_t* panWindow) {
     unsigned nWhole = 0xff;
-    const unsigned char* pabyRow = oWindow.pabyWindow;
-    for (int nRow = 0; nRow < oWindow.nWndRows; ++nRow, pabyRow += oWindow.nSrcCols) {
+    const unsigned char* pabyRow = oMask.pabyWindow;
+    for (int nRow = 0; nRow < oMask.nWndRows; ++nRow, pabyRow += oMask.nSrcCols) {
         int nCol = 0;
-        for (; nCol + 1 < oWindow.nWndCols; nCol += 2) {
+        for (; nCol + 1 < oMask.nWndCols; nCol += 2) {
             nWhole &= FullPairBits(pabyRow + nCol, panWindow);
         }
-        if (nCol < oWindow.nWndCols) {
+        if (nCol < oMask.nWndCols) {
             nWhole &= ~ByteBits(pabyRow + nCol, panWindow, 0);
         }
     }
@@ -140,29 +138,34 @@ inline unsigned WholeBits(const MaskWindow& oWindow, const std::int64_t* panWind
 }
 
 // Which of the nearest pixels of eight pixels may be used.
-inline unsigned UsableBits(const MaskWindow& oWindow, const std::int64_t* panNearest) {
-    if (oWindow.panUsable != nullptr) {
-        return MapBits(oWindow.panUsable, panNearest);
-    }
-    return oWindow.bExactlyOne ? ByteBits(oWindow.pabyNearest, panNearest, 1)
-                               : ~ByteBits(oWindow.pabyNearest, panNearest, 0);
+inline unsigned UsableBits(const ClassRules& oRules, const MaskBytes& oMask,
+                           const std::int64_t* panNearest) {
+    return oRules.bExactlyOne ? ByteBits(oMask.pabyNearest, panNearest, 1)
+                              : ~ByteBits(oMask.pabyNearest, panNearest, 0);
 }
 
-// Bits of eight pixels in a row of bits.
-inline unsigned FindBits(const std::uint64_t* panRow, const BitGroup& oGroup,
-                         const std::int64_t* panPlace) {
-    return oGroup.nFirst >= 0 ? GroupBits(panRow, oGroup) : MapBits(panRow, panPlace);
-}
+// A bit for each pixel of a span.
+struct SpanBits {
+    static constexpr int kWord = 64;
+
+    // The bits of pixels i to i + 7.
+    void Add(int i, unsigned nBits) {
+        an[i / kWord] |= std::uint64_t{nBits & 0xffu} << (i % kWord);
+    }
+    unsigned Get(int i) const {
+        return static_cast<unsigned>(an[i / kWord] >> (i % kWord)) & 0xffu;
+    }
+
+    std::uint64_t an[kSpanPixels / kWord] = {};
+};
 
 // Writes classes of pixels, or the modes that belong to them, and keeps the set of what it wrote.
-// Pixels come in groups of eight and are written 64 at a time.
 class ClassWriter {
  public:
-    // Without modes, classes are written.
-    ClassWriter(const unsigned char* pabyModeOfClass, int nPix, unsigned char* paby)
+    ClassWriter(const ClassRules& oRules, int nPix, unsigned char* paby)
         : mnPix(nPix), mpaby(paby) {
-        if (pabyModeOfClass != nullptr) {
-            __builtin_memcpy(mabyWritten, pabyModeOfClass, sizeof mabyWritten);
+        if (oRules.pabyModeOfClass != nullptr) {
+            __builtin_memcpy(mabyWritten, oRules.pabyModeOfClass, sizeof mabyWritten);
         }
         for (int k = 0; k < 4; ++k) {
             manBit0[k] = (mabyWritten[k] & 1) != 0 ? ~std::uint64_t{0} : 0;
@@ -170,23 +173,16 @@ class ClassWriter {
         }
     }
 
-    // Whether the nearest pixel decides about those whose windows are whole.
+    // Whether the nearest pixel decides about those whose windows fit.
     bool NearestDecides() const {
         return mabyWritten[kClassFits] != mabyWritten[kClassFits | kClassNear];
     }
 
-    // Adds the pixels i to i + 7.
-    void Add(int i, unsigned nFits, unsigned nNear) {
-        const int nShift = i % kWord;
-        mnFits |= std::uint64_t{nFits & 0xffu} << nShift;
-        mnNear |= std::uint64_t{nNear & 0xffu} << nShift;
-        if (nShift == kWord - kLanes || i + kLanes >= mnPix) {
-            Write(i - nShift);
+    // Writes all pixels. Returns the set.
+    unsigned Write(const SpanBits& oFits, const SpanBits& oNear) {
+        for (int i = 0; i < mnPix; i += SpanBits::kWord) {
+            WriteWord(i, oFits.an[i / SpanBits::kWord], oNear.an[i / SpanBits::kWord]);
         }
-    }
-
-    // Of all pixels, when they have been added.
-    unsigned GetSet() const {
         unsigned nSet = 0;
         for (int k = 0; k < 4; ++k) {
             nSet |= manFound[k] != 0 ? 1u << mabyWritten[k] : 0u;
@@ -195,19 +191,15 @@ class ClassWriter {
     }
 
  private:
-    static constexpr int kWord = 64;
-
-    void Write(int i) {
+    void WriteWord(int i, std::uint64_t nFits, std::uint64_t nNear) {
         // Mostly all pixels are of one class, and those behind the last one may be what they like.
         const std::uint64_t nExist =
-            mnPix - i < kWord ? (std::uint64_t{1} << (mnPix - i)) - 1 : ~std::uint64_t{0};
-        const std::uint64_t nFits = mnFits & nExist;
-        const std::uint64_t nNear = mnNear & nExist;
-        mnFits = 0;
-        mnNear = 0;
+            mnPix - i < SpanBits::kWord ? (std::uint64_t{1} << (mnPix - i)) - 1 : ~std::uint64_t{0};
+        nFits &= nExist;
+        nNear &= nExist;
         if ((nFits == 0 || nFits == nExist) && (nNear == 0 || nNear == nExist)) {
             const int nClass = (nFits != 0 ? kClassFits : 0) | (nNear != 0 ? kClassNear : 0);
-            __builtin_memset(mpaby + i, mabyWritten[nClass], kWord);
+            __builtin_memset(mpaby + i, mabyWritten[nClass], SpanBits::kWord);
             manFound[nClass] = 1;
             return;
         }
@@ -230,96 +222,141 @@ class ClassWriter {
     std::uint64_t manBit0[4];
     std::uint64_t manBit1[4];
     std::uint64_t manFound[4] = {};
-    std::uint64_t mnFits = 0;
-    std::uint64_t mnNear = 0;
 };
 
-VETRA_STAGE unsigned MaskClasses(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                                 const std::int64_t* panNearest, int nPix,
-                                 unsigned char* pabyClassThenMode) {
-    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, pabyClassThenMode);
+VETRA_STAGE unsigned MaskClasses(const ClassRules& oRules, const MaskBytes& oMask,
+                                 const std::int64_t* panWindow, const std::int64_t* panNearest,
+                                 int nPix, unsigned char* pabyClassThenMode) {
+    ClassWriter oWriter(oRules, nPix, pabyClassThenMode);
+    SpanBits oFits;
+    SpanBits oNear;
     for (int i = 0; i < nPix; i += kLanes) {
         const unsigned char* pabyGroup = pabyClassThenMode + i;
         const unsigned nBoth = Bits(BytesEqual(pabyGroup, kClassFits | kClassNear));
         unsigned nFits = nBoth | Bits(BytesEqual(pabyGroup, kClassFits));
         unsigned nNear = nBoth | Bits(BytesEqual(pabyGroup, kClassNear));
         // Where nothing fits the source may be smaller than a window.
-        if (oWindow.nWndRows != 0 && nFits != 0) {
-            nFits &= WholeBits(oWindow, panWindow + i);
+        if (oRules.bNeedsWhole && nFits != 0) {
+            nFits &= WholeBits(oMask, panWindow + i);
         }
         if (nFits != 0xff || oWriter.NearestDecides()) {
-            nNear &= UsableBits(oWindow, panNearest + i);
+            nNear &= UsableBits(oRules, oMask, panNearest + i);
         }
-        oWriter.Add(i, nFits, nNear);
+        oFits.Add(i, nFits);
+        oNear.Add(i, nNear);
     }
-    return oWriter.GetSet();
+    return oWriter.Write(oFits, oNear);
 }
 
-VETRA_STAGE unsigned RowClasses(const MaskWindow& oWindow, unsigned char nRowClass,
-                                const std::int64_t* panWindow, const std::int64_t* panNearest,
-                                int nPix, unsigned char* pabyClassThenMode) {
-    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, pabyClassThenMode);
-    const unsigned nRowFits = (nRowClass & kClassFits) != 0 ? 0xff : 0;
-    const unsigned nRowNear = (nRowClass & kClassNear) != 0 ? 0xff : 0;
-    const unsigned nUncounted = oWindow.nWndRows != 0 ? 0 : 0xff;
-    for (int i = 0; i < nPix; i += kLanes) {
-        const BitGroup& oWhole = oWindow.poWholeGroups[i / kLanes];
-        const BitGroup& oUsable = oWindow.poUsableGroups[i / kLanes];
-        oWriter.Add(
-            i,
-            oWhole.nInside & nRowFits &
-                (nUncounted | FindBits(oWindow.panWhole, oWhole, panWindow + i)),
-            oUsable.nInside & nRowNear & FindBits(oWindow.panUsable, oUsable, panNearest + i));
+// The bits of target columns from nCol on, which fnGroup gives for each group.
+template <typename Function>
+inline SpanBits RowBits(int nCol, int nPix, const Function& fnGroup) {
+    constexpr int kColumns = BitGroup::kColumns;
+    constexpr int kWord = SpanBits::kWord;
+    SpanBits oBits;
+    const int nShift = nCol % kColumns;
+    int i = -nShift;
+    for (int g = nCol / kColumns; i < nPix; ++g, i += kColumns) {
+        const std::uint64_t nGroup = fnGroup(g);
+        if (i < 0) {
+            oBits.an[0] = nGroup >> nShift;
+            continue;
+        }
+        oBits.an[i / kWord] |= nGroup << (i % kWord);
+        // A group may begin in one word and end in the next.
+        const int nNext = (i + kColumns - 1) / kWord;
+        if (nNext != i / kWord && nNext < kSpanPixels / kWord) {
+            oBits.an[nNext] = nGroup >> (kWord - i % kWord);
+        }
     }
-    return oWriter.GetSet();
+    return oBits;
 }
 
-VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const MaskWindow& oWindow,
-                                  std::int64_t nBitPitch, double dfPitch, double dfChan,
+VETRA_STAGE unsigned RowClasses(const ClassRules& oRules, const MaskRow& oMask,
+                                unsigned char nRowClass, int nCol, int nPix,
+                                unsigned char* pabyClassThenMode, unsigned char* pabyBroken) {
+    SpanBits oInside;
+    SpanBits oWhole;
+    SpanBits oNear;
+    if ((nRowClass & kClassFits) != 0) {
+        if (!oRules.bNeedsWhole) {
+            oInside = RowBits(nCol, nPix, [&](int g) { return oMask.poWholeGroups[g].nInside; });
+        }
+        if (oRules.bNeedsWhole || pabyBroken != nullptr) {
+            oWhole = RowBits(nCol, nPix, [&](int g) {
+                return GroupBits(oMask.panWhole, oMask.poWholeGroups[g],
+                                 oMask.panWindowCol + g * BitGroup::kColumns);
+            });
+        }
+    }
+    if ((nRowClass & kClassNear) != 0) {
+        oNear = RowBits(nCol, nPix, [&](int g) {
+            return GroupBits(oMask.panUsable, oMask.poUsableGroups[g],
+                             oMask.panNearestCol + g * BitGroup::kColumns);
+        });
+    }
+    if (pabyBroken != nullptr) {
+        for (int k = 0; k * SpanBits::kWord < nPix; ++k) {
+            StoreBits(pabyBroken + k * SpanBits::kWord, oInside.an[k] & ~oWhole.an[k],
+                      std::uint64_t{0});
+        }
+    }
+    return ClassWriter(oRules, nPix, pabyClassThenMode)
+        .Write(oRules.bNeedsWhole ? oWhole : oInside, oNear);
+}
+
+VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const ClassRules& oRules,
+                                  const MaskBands& oMask, double dfPitch, double dfChan,
                                   const double* padfCol, const double* padfRow, int nPix,
                                   const SpanPlaces& oPlaces) {
     const Limits oLimits(oClassLimits);
-    ClassWriter oWriter(oWindow.pabyModeOfClass, nPix, oPlaces.pabyClassThenMode);
-    const double dfBitPitch = static_cast<double>(nBitPitch);
-    const F64 bitPitch = Set1(dfBitPitch);
+    ClassWriter oWriter(oRules, nPix, oPlaces.pabyClassThenMode);
+    const F64 zero = Set1(0.0);
     const F64 pitch = Set1(dfPitch);
     const F64 chan = Set1(dfChan);
-    const F64 firstBit = Set1(oClassLimits.dfRowOff * dfBitPitch + oClassLimits.dfColOff);
-    const F64 first = Set1(oClassLimits.dfRowOff * dfPitch + oClassLimits.dfColOff * dfChan);
+    const F64 colOff = Set1(oClassLimits.dfColOff);
+    const F64 rowOff = Set1(oClassLimits.dfRowOff);
+    SpanBits oFits;
+    SpanBits oNear;
+    // Groups whose nearest pixels matter; a branch for each would be foreseen badly.
+    const bool bNearestDecides = oWriter.NearestDecides();
+    int anOther[kSpanPixels / kLanes];
+    int nOthers = 0;
     for (int i = 0; i < nPix; i += kLanes) {
-        const F64 col = Load(padfCol + i);
-        const F64 row = Load(padfRow + i);
         unsigned nFits = 0;
         if (oPlaces.panWindow != nullptr) {
+            const F64 col = Load(padfCol + i);
+            const F64 row = Load(padfRow + i);
             const B64 fit = oLimits.Fit(col, row);
             const F64 anchorCol = Anchor(oClassLimits, col);
             const F64 anchorRow = Anchor(oClassLimits, row);
-            StorePlaces(oPlaces.panWindow + i, fit, anchorRow * pitch + anchorCol * chan + first);
+            const F64 windowCol = Select(fit, anchorCol + colOff, zero);
+            const F64 windowRow = Select(fit, anchorRow + rowOff, zero);
+            StoreIntegers(oPlaces.panWindow + i, windowRow * pitch + windowCol * chan);
             Store(oPlaces.padfFracCol + i, col - anchorCol);
             Store(oPlaces.padfFracRow + i, row - anchorRow);
-            const unsigned nWhole =
-                MapBits(oWindow.panWhole,
-                        Select(fit, anchorRow * bitPitch + anchorCol + firstBit, Set1(0.0)));
             nFits = Bits(fit);
+            const unsigned nWhole = BandBits(oMask.pabyWhole, oMask.nPitch, windowCol, windowRow);
             if (oPlaces.pabyBroken != nullptr) {
                 StoreBits(oPlaces.pabyBroken + i, nFits & ~nWhole, 0u);
             }
-            if (oWindow.nWndRows != 0) {
-                nFits &= nWhole;
-            }
+            nFits &= oRules.bNeedsWhole ? nWhole : 0xffu;
         }
-        unsigned nNear = 0;
-        if (nFits != 0xff || oWriter.NearestDecides()) {
-            const B64 near = oLimits.Near(col, row);
-            const F64 nearCol = Nearest(col);
-            const F64 nearRow = Nearest(row);
-            StorePlaces(oPlaces.panNearest + i, near, nearRow * pitch + nearCol * chan);
-            nNear = Bits(near) & MapBits(oWindow.panUsable,
-                                         Select(near, nearRow * bitPitch + nearCol, Set1(0.0)));
-        }
-        oWriter.Add(i, nFits, nNear);
+        oFits.Add(i, nFits);
+        anOther[nOthers] = i;
+        nOthers += nFits != 0xff || bNearestDecides ? 1 : 0;
     }
-    return oWriter.GetSet();
+    for (int k = 0; k < nOthers; ++k) {
+        const int i = anOther[k];
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        const B64 near = oLimits.Near(col, row);
+        const F64 nearCol = Select(near, Nearest(col), zero);
+        const F64 nearRow = Select(near, Nearest(row), zero);
+        StoreIntegers(oPlaces.panNearest + i, nearRow * pitch + nearCol * chan);
+        oNear.Add(i, Bits(near) & BandBits(oMask.pabyUsable, oMask.nPitch, nearCol, nearRow));
+    }
+    return oWriter.Write(oFits, oNear);
 }
 
 VETRA_STAGE void MaskBits(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
@@ -336,17 +373,14 @@ VETRA_STAGE void MaskBits(const unsigned char* pabyMask, std::int64_t nCount, un
     }
 }
 
-VETRA_STAGE void BrokenWindows(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                               const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken) {
-    for (int i = 0; i < nPix; i += kLanes) {
-        unsigned nBroken = Bits(BytesEqual(pabyMode + i, 1));
-        if (nBroken != 0) {
-            nBroken &=
-                ~(oWindow.poWholeGroups != nullptr
-                      ? FindBits(oWindow.panWhole, oWindow.poWholeGroups[i / kLanes], panWindow + i)
-                      : MapBits(oWindow.panWhole, panWindow + i));
+VETRA_STAGE void MakeBand(const std::uint64_t* panBits, std::int64_t nRowWords, int nRows,
+                          std::int64_t nWords, unsigned char* pabyBand) {
+    __builtin_memset(pabyBand, 0, static_cast<std::size_t>(nWords) * 64);
+    for (int r = 0; r < nRows; ++r) {
+        for (std::int64_t n = 0; n < nWords; ++n) {
+            AddBits(pabyBand + n * 64, panBits[r * nRowWords + n],
+                    static_cast<unsigned char>(1 << r));
         }
-        StoreBits(pabyBroken + i, nBroken, 0u);
     }
 }
 
@@ -355,14 +389,16 @@ VETRA_STAGE unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow,
                                const double* padfRow, int nPix, unsigned char* pabyMode) {
     const Limits oLimits(oClassLimits);
     const unsigned char abyModeOfClass[4] = {0, 1, nFallback, 1};
-    ClassWriter oWriter(abyModeOfClass, nPix, pabyMode);
+    SpanBits oFits;
+    SpanBits oNear;
     for (int i = 0; i < nPix; i += kLanes) {
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
         const unsigned nFit = bWindow ? Bits(oLimits.Fit(col, row)) : 0u;
-        oWriter.Add(i, nFit, nFit == 0xffu ? 0u : Bits(oLimits.Near(col, row)));
+        oFits.Add(i, nFit);
+        oNear.Add(i, nFit == 0xffu ? 0u : Bits(oLimits.Near(col, row)));
     }
-    return oWriter.GetSet();
+    return ClassWriter({abyModeOfClass, false, false}, nPix, pabyMode).Write(oFits, oNear);
 }
 
 VETRA_STAGE void Windows(const ClassLimits& oLimits, double dfPitch, double dfChan,

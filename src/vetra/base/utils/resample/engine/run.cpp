@@ -89,36 +89,29 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
             oMemory.padfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
         }
         if (moTask.oOptions.ePath != Path::ePlain && moTask.pabySrcMask != nullptr) {
-            oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages);
+            oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages, moColumns.vdfFrac.empty());
         }
     }
     return oMemory;
 }
 
-MaskWindow Run::GetMaskWindow(const MaskView& oMask) const {
+ClassRules Run::GetClassRules() const {
     // The other rules look at the nearest pixel alone, whose byte only has to differ from 0.
     const bool bWholeWindow = moMethod.eRule == ModeRule::eWindow;
-    return {oMask.panWhole,
-            oMask.panUsable,
-            oMask.poWholeGroups,
-            oMask.poUsableGroups,
-            oMask.pabyWindow,
-            oMask.pabyNearest,
-            moTask.nSrcCols,
-            moMethod.oWindow.nCols,
-            bWholeWindow ? moMethod.oWindow.nRows : 0,
-            bWholeWindow,
-            moTask.pabyTgtMask == nullptr ? mabyModeOfClass : nullptr};
+    return {moTask.pabyTgtMask == nullptr ? mabyModeOfClass : nullptr, bWholeWindow, bWholeWindow};
 }
 
 // Turns classes into modes. Returns the set of modes.
-unsigned Run::ChooseModes(long long nFirst, int nPix, const MaskView& oMask,
-                          const std::int64_t* panWindow, const std::int64_t* panNearest,
-                          unsigned char* pabyClassThenMode) const {
+unsigned Run::ChooseModes(long long nFirst, int nPix, const unsigned char* pabyWindowMask,
+                          const unsigned char* pabyNearestMask, const std::int64_t* panWindow,
+                          const std::int64_t* panNearest, unsigned char* pabyClassThenMode) const {
     unsigned nModes = 0;
     if (moTask.pabySrcMask != nullptr) {
-        nModes = moStages.pfnMaskClasses(GetMaskWindow(oMask), panWindow, panNearest, nPix,
-                                         pabyClassThenMode);
+        const Window& oWindow = moMethod.oWindow;
+        nModes = moStages.pfnMaskClasses(
+            GetClassRules(),
+            {pabyWindowMask, pabyNearestMask, moTask.nSrcCols, oWindow.nCols, oWindow.nRows},
+            panWindow, panNearest, nPix, pabyClassThenMode);
     }
     return ApplyRequests(nFirst, nPix, nModes, pabyClassThenMode);
 }

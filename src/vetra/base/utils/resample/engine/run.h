@@ -116,19 +116,10 @@ class Run {
     void FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
                  const ThreadMemory& oMemory, ValueArrays& oValues) const;
 
-    // Of the mask, what the windows of a span see.
-    struct MaskView {
-        const std::uint64_t* panWhole;
-        const std::uint64_t* panUsable;
-        const BitGroup* poWholeGroups;
-        const BitGroup* poUsableGroups;
-        const unsigned char* pabyWindow;
-        const unsigned char* pabyNearest;
-    };
-    MaskWindow GetMaskWindow(const MaskView& oMask) const;
-    unsigned ChooseModes(long long nFirst, int nPix, const MaskView& oMask,
-                         const std::int64_t* panWindow, const std::int64_t* panNearest,
-                         unsigned char* pabyClassThenMode) const;
+    ClassRules GetClassRules() const;
+    unsigned ChooseModes(long long nFirst, int nPix, const unsigned char* pabyWindowMask,
+                         const unsigned char* pabyNearestMask, const std::int64_t* panWindow,
+                         const std::int64_t* panNearest, unsigned char* pabyClassThenMode) const;
     unsigned ApplyRequests(long long nFirst, int nPix, unsigned nModes,
                            unsigned char* pabyClassThenMode) const;
 

@@ -11,22 +11,22 @@ namespace {
 // Picks the broken windows out of a span.
 void Pack(const Span& oSpan, PackedWindows& oBroken) {
     int n = 0;
-    const auto fnAdd = [&](int i) {
-        oBroken.anPixel[n] = i;
-        oBroken.anOffset[n] = oSpan.panWindow[i];
-        oBroken.adfFracCol[n] = oSpan.padfFracCol[i];
-        oBroken.adfFracRow[n] = oSpan.padfFracRow[i];
-        ++n;
-    };
     for (int i = 0; i < oSpan.nPix; ++i) {
-        if (oSpan.pabyBroken[i] != 0 && oSpan.pabyMode[i] == ePO_INTERPOLATED) {
-            fnAdd(i);
-        }
+        // A branch would be foreseen badly.
+        oBroken.anPixel[n] = i;
+        n += static_cast<int>(oSpan.pabyBroken[i] != 0) &
+             static_cast<int>(oSpan.pabyMode[i] == ePO_INTERPOLATED);
     }
     oBroken.nPix = n;
     // Whole groups are computed.
-    while (n % kLanes != 0) {
-        fnAdd(oBroken.anPixel[n - 1]);
+    for (; n % kLanes != 0; ++n) {
+        oBroken.anPixel[n] = oBroken.anPixel[n - 1];
+    }
+    for (int k = 0; k < n; ++k) {
+        const int i = oBroken.anPixel[k];
+        oBroken.anOffset[k] = oSpan.panWindow[i];
+        oBroken.adfFracCol[k] = oSpan.padfFracCol[i];
+        oBroken.adfFracRow[k] = oSpan.padfFracRow[i];
     }
 }
 }  // namespace

@@ -51,10 +51,8 @@ void Run::Place(SpanArrays& oArrays) const {
     } else {
         moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
                             oArrays.abyMode, oArrays.anWindow, oArrays.anNearest);
-        oSpan.nModes = ChooseModes(
-            oSpan.nFirst, nPix,
-            {nullptr, nullptr, nullptr, nullptr, moTask.pabySrcMask, moTask.pabySrcMask},
-            oArrays.anWindow, oArrays.anNearest, oArrays.abyMode);
+        oSpan.nModes = ChooseModes(oSpan.nFirst, nPix, moTask.pabySrcMask, moTask.pabySrcMask,
+                                   oArrays.anWindow, oArrays.anNearest, oArrays.abyMode);
     }
     if ((oSpan.nModes & kSetInterpolated) != 0) {
         moStages.pfnWindows(moLimits, static_cast<double>(mnPitch), moTask.nChan, oArrays.adfCol,
@@ -72,11 +70,8 @@ void Run::Place(SpanArrays& oArrays) const {
 void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
     Span& oSpan = oArrays.oSpan;
     const bool bReplacing = moMethod.eRule == ModeRule::eReplacingWindow;
-    MaskView oMask{};
-    oMask.panWhole = oMap.GetWhole(0);
-    oMask.panUsable = oMap.GetUsable(0);
     oSpan.nModes = moStages.pfnMappedPlaces(
-        moLimits, GetMaskWindow(oMask), oMap.GetPitch(), static_cast<double>(mnPitch), moTask.nChan,
+        moLimits, GetClassRules(), oMap.GetBands(), static_cast<double>(mnPitch), moTask.nChan,
         oArrays.adfCol, oArrays.adfRow, oSpan.nPix,
         {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr,
          moMethod.eValues != eVR_NONE ? oArrays.anWindow : nullptr, oArrays.anNearest,

@@ -60,23 +60,26 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
     const long long nNearestRow = bNear ? static_cast<long long>(dfNearRow) : 0;
     oSpan.pWindowSrc = SrcRow(nWindowRow);
     oSpan.pNearestSrc = SrcRow(nNearestRow);
-    MaskView oMask{};
+    const unsigned char* pabyNearestMask = nullptr;
+    bool bMapped = false;
+    MaskRow oMask{};
     if (moTask.pabySrcMask != nullptr) {
         oSpan.pabyWindowMask = moTask.pabySrcMask + nWindowRow * moTask.nSrcCols;
-        oMask.pabyWindow = oSpan.pabyWindowMask;
-        oMask.pabyNearest = moTask.pabySrcMask + nNearestRow * moTask.nSrcCols;
+        pabyNearestMask = moTask.pabySrcMask + nNearestRow * moTask.nSrcCols;
         Reach oRows;
         oRows.Add(nWindowRow);
         oRows.Add(nNearestRow);
         if (oMemory.poMap != nullptr && oMemory.poMap->Provide(moColumns.oReach, oRows)) {
-            oMask.panWhole = oMemory.poMap->GetWhole(nWindowRow);
-            oMask.panUsable = oMemory.poMap->GetUsable(nNearestRow);
+            bMapped = true;
+            oMask = {oMemory.poMap->GetWhole(nWindowRow), oMemory.poMap->GetUsable(nNearestRow),
+                     moColumns.voWholeGroups.data(),      moColumns.voUsableGroups.data(),
+                     moColumns.vnWindowCol.data(),        moColumns.vnNearestCol.data()};
         }
     }
     // Rows know nothing of replaced samples.
     const bool bReplacing =
         moMethod.eRule == ModeRule::eReplacingWindow && moTask.pabySrcMask != nullptr;
-    RowCache* poRows = bReplacing && oMask.panWhole == nullptr ? nullptr : oMemory.poRows.get();
+    RowCache* poRows = bReplacing && !bMapped ? nullptr : oMemory.poRows.get();
     bool bFetched = false;
     alignas(64) unsigned char abyMode[kSpanArray];
     alignas(64) unsigned char abyBroken[kSpanArray];
@@ -94,29 +97,22 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
             oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
         } else {
-            const bool bGroups = oMask.panWhole != nullptr && nCol % kLanes == 0;
-            oMask.poWholeGroups =
-                bGroups ? moColumns.voWholeGroups.data() + nCol / kLanes : nullptr;
-            oMask.poUsableGroups =
-                bGroups ? moColumns.voUsableGroups.data() + nCol / kLanes : nullptr;
-            const std::int64_t* panWindow = moColumns.vnWindowCol.data() + nCol;
-            const std::int64_t* panNearest = moColumns.vnNearestCol.data() + nCol;
-            if (bGroups) {
+            oSpan.pabyMode = abyMode;
+            if (bMapped) {
                 const unsigned nModes = moStages.pfnRowClasses(
-                    GetMaskWindow(oMask), nRowClass, panWindow, panNearest, oSpan.nPix, abyMode);
+                    GetClassRules(), oMask, nRowClass, static_cast<int>(nCol), oSpan.nPix, abyMode,
+                    bReplacing ? abyBroken : nullptr);
                 oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, nModes, abyMode);
             } else {
                 const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
                 for (int i = 0; i < kSpanPixels; ++i) {
                     abyMode[i] = pabyClass[i] & nRowClass;
                 }
-                oSpan.nModes =
-                    ChooseModes(oSpan.nFirst, oSpan.nPix, oMask, panWindow, panNearest, abyMode);
+                oSpan.nModes = ChooseModes(oSpan.nFirst, oSpan.nPix, oSpan.pabyWindowMask,
+                                           pabyNearestMask, moColumns.vnWindowCol.data() + nCol,
+                                           moColumns.vnNearestCol.data() + nCol, abyMode);
             }
-            oSpan.pabyMode = abyMode;
-            if (bReplacing && oMask.panWhole != nullptr) {
-                moStages.pfnBrokenWindows(GetMaskWindow(oMask), panWindow, abyMode, oSpan.nPix,
-                                          abyBroken);
+            if (bReplacing && bMapped) {
                 oSpan.eValues = PlainRow(moMethod);
                 oSpan.pabyBroken = abyBroken;
             }

@@ -43,12 +43,26 @@ inline bool AnySmallNumber(const Number (&x)[N]) {
     return nSmall != 0;
 }
 
-// Bits of eight numbers, set where a map has a bit at that number.
-inline unsigned PickBits(const std::uint64_t* panMap, const std::int64_t* panPlace) {
-    std::uint64_t nBits = 0;
-    for (int i = 0; i < kLanes; ++i) {
-        const std::int64_t n = panPlace[i];
-        nBits |= (panMap[n >> 6] >> (n & 63) & 1u) << i;
+// Bits of a group's columns in a row of bits.
+inline std::uint32_t PickGroupBits(const std::uint64_t* panRow, const BitGroup& oGroup,
+                                   const std::int64_t* panCol) {
+    std::uint32_t nBits = 0;
+    for (int i = 0; i < BitGroup::kColumns; ++i) {
+        const std::int64_t n = panCol[i];
+        const std::uint64_t nBit = oGroup.abyBit[i] != 0 ? panRow[n >> 6] >> (n & 63) & 1u : 0u;
+        nBits |= static_cast<std::uint32_t>(nBit) << i;
     }
-    return static_cast<unsigned>(nBits);
+    return nBits;
+}
+
+// Bits of eight pixels in bands.
+template <typename Integer>
+inline unsigned PickBandBits(const unsigned char* pabyMap, std::int64_t nPitch,
+                             const Integer* panCol, const Integer* panRow) {
+    unsigned nBits = 0;
+    for (int i = 0; i < kLanes; ++i) {
+        const unsigned nByte = pabyMap[panRow[i] / kBandRows * nPitch + panCol[i]];
+        nBits |= (nByte >> panRow[i] % kBandRows & 1u) << i;
+    }
+    return nBits;
 }

@@ -50,38 +50,60 @@ struct PositionBounds {
     double dfLastRow;
 };
 
-/// Where the windows, or the nearest pixels, of eight neighbouring target columns find their bits
-/// in a row of bits.
+/// Where the windows, or the nearest pixels, of neighbouring target columns find their bits in a
+/// row of bits.
 struct BitGroup {
-    static constexpr int kReach = 32;
-    /// By how much 32 bits from nFirst on are to be shifted left to bring a column's bit to the
-    /// top.
-    unsigned char abyShift[kLanes];
-    /// Below 0 where 32 bits don't hold all.
-    std::int64_t nFirst;
+    static constexpr int kColumns = 32;
+    static constexpr int kBytes = 16;
+    /// Of each column, the byte that has its bit, counted from nFirst, and the bit within that
+    /// byte: 0 where the column is outside the source.
+    unsigned char abyPlace[kColumns];
+    unsigned char abyBit[kColumns];
     /// A bit for each column that is inside the source.
-    unsigned char nInside;
+    std::uint32_t nInside;
+    /// The first byte of kBytes; below 0 where they don't hold all bits.
+    std::int64_t nFirst;
 };
 
-/// The source mask, as a run's windows see it.
-struct MaskWindow {
-    /// A bit for each window, set where it is whole, and one for each nearest pixel, set where it
-    /// may be used; or null, and the bytes are looked at.
-    const std::uint64_t* panWhole;
-    const std::uint64_t* panUsable;
-    /// Of each eight windows, and nearest pixels, where all lie in one row of bits; or null.
-    const BitGroup* poWholeGroups;
-    const BitGroup* poUsableGroups;
+/// What classes of pixels mean in a run.
+struct ClassRules {
+    /// The mode of each class, where they are the same for all pixels; or null, and what comes out
+    /// are classes.
+    const unsigned char* pabyModeOfClass;
+    bool bNeedsWhole;  ///< a window that isn't whole doesn't fit
+    bool bExactlyOne;  ///< a nearest pixel may be used where its mask byte is 1, else where not 0
+};
+
+/// The source mask's bytes, from the window and the nearest pixel to which an index of 0 leads.
+struct MaskBytes {
     const unsigned char* pabyWindow;
     const unsigned char* pabyNearest;
     int nSrcCols;
     int nWndCols;
-    int nWndRows;  ///< 0 where it doesn't matter whether windows are whole
-    bool bExactlyOne;
-    /// The mode of each class, where they are the same for all pixels; or null, and what comes out
-    /// are classes.
-    const unsigned char* pabyModeOfClass;
+    int nWndRows;
 };
+
+/// What is known of the source mask in a row of the source: a bit for each window, set where it is
+/// whole, and one for each nearest pixel, set where it may be used. Groups and columns are those of
+/// all target columns.
+struct MaskRow {
+    const std::uint64_t* panWhole;
+    const std::uint64_t* panUsable;
+    const BitGroup* poWholeGroups;
+    const BitGroup* poUsableGroups;
+    const std::int64_t* panWindowCol;
+    const std::int64_t* panNearestCol;
+};
+
+/// The same bits of the whole source, in bands of eight rows: a byte holds those of a column, the
+/// uppermost one in bit 0. Reading begins anywhere in the bands and may go on for kBandReach bytes.
+struct MaskBands {
+    const unsigned char* pabyWhole;
+    const unsigned char* pabyUsable;
+    std::int64_t nPitch;
+};
+constexpr int kBandRows = 8;
+constexpr int kBandReach = 16;
 
 /// Of each pixel of a span what becomes of it, and the places of its window and nearest pixel.
 struct SpanPlaces {
@@ -302,32 +324,33 @@ struct LevelStages {
                        const double* padfRow, int nPix, unsigned char* pabyClass,
                        std::int64_t* panWindow, std::int64_t* panNearest);
     /// Takes masked pixels out of the classes: the window bit where the window holds a mask byte of
-    /// 0, the nearest bit where that pixel's byte is 0 (bExactlyOne: is not 1). The masks are
-    /// those of the window and of the nearest pixel to which an index of 0 leads.
-    /// Returns the set of what it wrote (1 << class or mode).
-    unsigned (*pfnMaskClasses)(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                               const std::int64_t* panNearest, int nPix,
-                               unsigned char* pabyClassThenMode);
-    /// The same where all windows lie in one row of bits, and all nearest pixels: classes or modes,
-    /// from the class of the target row.
-    unsigned (*pfnRowClasses)(const MaskWindow& oWindow, unsigned char nRowClass,
-                              const std::int64_t* panWindow, const std::int64_t* panNearest,
-                              int nPix, unsigned char* pabyClassThenMode);
+    /// 0, the nearest bit where that pixel can't be used. Returns the set of what it wrote
+    /// (1 << class or mode).
+    unsigned (*pfnMaskClasses)(const ClassRules& oRules, const MaskBytes& oMask,
+                               const std::int64_t* panWindow, const std::int64_t* panNearest,
+                               int nPix, unsigned char* pabyClassThenMode);
+    /// Classes or modes of target columns from nCol on, where all windows lie in one row and all
+    /// nearest pixels, from the class of that row; and 1 for pixels whose windows fit but aren't
+    /// whole, else 0 (pabyBroken may be null).
+    unsigned (*pfnRowClasses)(const ClassRules& oRules, const MaskRow& oMask,
+                              unsigned char nRowClass, int nCol, int nPix,
+                              unsigned char* pabyClassThenMode, unsigned char* pabyBroken);
     /// Bits of nCount mask bytes, set where they are nValue (bEqual) or aren't; and zeros up to a
     /// whole word.
     void (*pfnMaskBits)(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,
                         bool bEqual, std::uint64_t* panBits);
+    /// Makes a band of up to kBandRows rows of bits, nRowWords from one to the next: 64 bytes of
+    /// each word.
+    void (*pfnMakeBand)(const std::uint64_t* panBits, std::int64_t nRowWords, int nRows,
+                        std::int64_t nWords, unsigned char* pabyBand);
     PositionBounds (*pfnBounds)(const double* padfCol, const double* padfRow, int nPix);
     /// Classes or modes, where bits of the mask are known, and places: as pfnClasses,
     /// pfnMaskClasses, pfnWindows and pfnNearestPlaces, but places are given for all windows that
     /// fit, and nearest ones only in groups in which the class of one pixel depends on it.
-    unsigned (*pfnMappedPlaces)(const ClassLimits& oLimits, const MaskWindow& oWindow,
-                                std::int64_t nBitPitch, double dfPitch, double dfChan,
+    unsigned (*pfnMappedPlaces)(const ClassLimits& oLimits, const ClassRules& oRules,
+                                const MaskBands& oMask, double dfPitch, double dfChan,
                                 const double* padfCol, const double* padfRow, int nPix,
                                 const SpanPlaces& oPlaces);
-    /// Writes 1 for those of nPix pixels whose mode is 1 and whose windows aren't whole, else 0.
-    void (*pfnBrokenWindows)(const MaskWindow& oWindow, const std::int64_t* panWindow,
-                             const unsigned char* pabyMode, int nPix, unsigned char* pabyBroken);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where
     /// the window fits, else nFallback where the nearest pixel is inside, else 0. Returns the set
     /// of modes (1 << mode).

@@ -12,6 +12,7 @@
 //   DivideBy                     division by a Divisor, of numbers that are not tiny
 //   AnyTiny                      whether there are any that DivideBy can't divide: below 2^-511 in
 //                                size, except 0
+//   Least Greatest               the first where it is less, or greater, else the second
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
@@ -19,9 +20,10 @@
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
-//   MapBits                      bits: which of eight numbers a map of bits has
-//   GroupBits                    bits: the same where a BitGroup says where they are
-//   StoreBits                    64 bytes: bit 0 of each from one word, bit 1 from another
+//   GroupBits                    bits: which of a BitGroup's columns a row of bits has
+//   BandBits                     bits: which of eight pixels bands of bits have, as MaskBands
+//   StoreBits AddBits            64 bytes: bit 0 of each from one word, bit 1 from another; one bit
+//                                of each, among those that are set
 //   EqualBits                    bits: which of 64 bytes have a value
 //   StoreIntegers                whole numbers from 0 to 2^52 as 64-bit integers
 //   Gather GatherPair            samples (pairs of adjacent samples) at eight offsets
@@ -130,9 +132,9 @@ const LevelStages kStages = {
     &MaskClasses,
     &RowClasses,
     &MaskBits,
+    &MakeBand,
     &Bounds,
     &MappedPlaces,
-    &BrokenWindows,
     &OpenModes,
     &Windows,
     &NearestPlaces,
