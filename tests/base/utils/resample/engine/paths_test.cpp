@@ -139,7 +139,7 @@ TEST_P(PathsOfMethod, MasksAndChannelsGiveThePlainResult) {
         ResampleInfo oInfo = InfoOf(GetParam(), oRandom.Pick({2, 3, 9, 67}));
         oInfo.meNodataFillAction = oRandom.Pick({eNFA_NN, eNFA_BGD});
         const BufPosScaleOffTfm oAligned =
-            AxisAligned(oRandom.Pick({1.0, 1.4, 0.6, -1.3}), oRandom.Pick({-5.25, 1200.0}));
+            AxisAligned(oRandom.Pick({1.0, 1.4, 0.6, -1.3, 5.5}), oRandom.Pick({-5.25, 1200.0}));
         const IBufPosTfm& oTfm =
             oRandom.Chance(0.5) ? static_cast<const IBufPosTfm&>(oAligned) : *poTurned;
         engine::RunOptions oOptions;
