@@ -86,6 +86,14 @@ VETRA_STAGE void Interleave(const void* pSamples, int nPix, void* pTgt) {
     }
 }
 
+// Pixels of a few channels, each in one or two moves.
+template <int kNumChan, typename T>
+inline void CopyWholePixels(const T* p, const std::int64_t* panOffset, int nPix, T* t) {
+    for (int i = 0; i < nPix; ++i) {
+        __builtin_memcpy(t + i * kNumChan, p + panOffset[i], kNumChan * sizeof(T));
+    }
+}
+
 template <typename T>
 VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
                             void* pTgt) {
@@ -100,6 +108,12 @@ VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int
             t[i] = p[panOffset[i]];
         }
         return;
+    }
+    if (nChan == 3) {
+        return CopyWholePixels<3>(p, panOffset, nPix, t);
+    }
+    if (nChan == 4) {
+        return CopyWholePixels<4>(p, panOffset, nPix, t);
     }
     for (int i = 0; i < nPix; ++i) {
         const T* pPixel = p + panOffset[i];
