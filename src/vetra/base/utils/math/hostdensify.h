@@ -21,8 +21,8 @@ namespace vetra::utils::math {
 /// threads. All four samples count, also those with a factor of 0: an infinity or NaN among them
 /// gives NaN.
 ///
-/// Runs on all OpenMP threads where there are rows enough, and takes memory for two rows of the grid
-/// per thread then. The time is linear in the size of the grid.
+/// Runs on all OpenMP threads where there are rows enough, and takes memory for two rows of the
+/// grid per thread then. The time is linear in the size of the grid.
 ///
 /// \param data     [rows x cols], row after row
 /// \param rows     number of rows; below 1 there is nothing to do
