@@ -152,9 +152,6 @@ struct SpanBits {
     void Add(int i, unsigned nBits) {
         an[i / kWord] |= std::uint64_t{nBits & 0xffu} << (i % kWord);
     }
-    unsigned Get(int i) const {
-        return static_cast<unsigned>(an[i / kWord] >> (i % kWord)) & 0xffu;
-    }
 
     std::uint64_t an[kSpanPixels / kWord] = {};
 };
