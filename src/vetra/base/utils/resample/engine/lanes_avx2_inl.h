@@ -155,6 +155,41 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
     fnStore(p + 4, a.hi);
 }
 
+// Eight pixels of a source: 0, 0 where they lie outside.
+struct Cells {
+    __m256i vCol;
+    __m256i vRow;
+    __m256i vInside;
+};
+// What isn't a 32-bit number becomes the least one, which is outside.
+inline Cells CellsInside(F64 col, F64 row, const CellLimits& o) {
+    const __m256i vCol = _mm256_add_epi32(ToInt32(col), _mm256_set1_epi32(o.nColOff));
+    const __m256i vRow = _mm256_add_epi32(ToInt32(row), _mm256_set1_epi32(o.nRowOff));
+    const auto fnInside = [](__m256i v, int nCount) {
+        // Of none, the sign can't be trusted.
+        const __m256i vLast = _mm256_set1_epi32(nCount - 1);
+        return nCount > 0 ? _mm256_cmpeq_epi32(_mm256_min_epu32(v, vLast), v)
+                          : _mm256_setzero_si256();
+    };
+    const __m256i vInside = _mm256_and_si256(fnInside(vCol, o.nCols), fnInside(vRow, o.nRows));
+    return {_mm256_and_si256(vCol, vInside), _mm256_and_si256(vRow, vInside), vInside};
+}
+inline unsigned Bits(const Cells& o) {
+    return static_cast<unsigned>(_mm256_movemask_ps(_mm256_castsi256_ps(o.vInside)));
+}
+
+inline void StorePlaces(std::int64_t* p, const Cells& o, int nPitch, int nChan) {
+    const __m256i vCol = _mm256_mullo_epi32(o.vCol, _mm256_set1_epi32(nChan));
+    const auto fnStore = [&](std::int64_t* q, __m128i vRow4, __m128i vCol4) {
+        const __m256i vPlace = _mm256_add_epi64(
+            _mm256_mul_epi32(_mm256_cvtepi32_epi64(vRow4), _mm256_set1_epi64x(nPitch)),
+            _mm256_cvtepi32_epi64(vCol4));
+        _mm256_storeu_si256(reinterpret_cast<__m256i*>(q), vPlace);
+    };
+    fnStore(p, _mm256_castsi256_si128(o.vRow), _mm256_castsi256_si128(vCol));
+    fnStore(p + 4, _mm256_extracti128_si256(o.vRow, 1), _mm256_extracti128_si256(vCol, 1));
+}
+
 #include "vetra/base/utils/resample/engine/lanes_avx_common_inl.h"
 
 inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {

@@ -100,6 +100,29 @@ inline void StoreIntegers(std::int64_t* p, F64 a) {
     _mm512_storeu_si512(p, _mm512_cvttpd_epi64(a.v));
 }
 
+// Eight pixels of a source: 0, 0 where they lie outside.
+struct Cells {
+    __m256i vCol;
+    __m256i vRow;
+    __mmask8 m;
+};
+// What isn't a 32-bit number becomes the least one, which is outside.
+inline Cells CellsInside(F64 col, F64 row, const CellLimits& o) {
+    const __m256i vCol = _mm256_add_epi32(ToInt32(col), _mm256_set1_epi32(o.nColOff));
+    const __m256i vRow = _mm256_add_epi32(ToInt32(row), _mm256_set1_epi32(o.nRowOff));
+    const __mmask8 m =
+        _mm256_mask_cmplt_epu32_mask(_mm256_cmplt_epu32_mask(vCol, _mm256_set1_epi32(o.nCols)),
+                                     vRow, _mm256_set1_epi32(o.nRows));
+    return {_mm256_maskz_mov_epi32(m, vCol), _mm256_maskz_mov_epi32(m, vRow), m};
+}
+inline unsigned Bits(const Cells& o) { return o.m; }
+
+inline void StorePlaces(std::int64_t* p, const Cells& o, int nPitch, int nChan) {
+    const __m512i vRow = _mm512_mul_epi32(_mm512_cvtepi32_epi64(o.vRow), _mm512_set1_epi64(nPitch));
+    const __m256i vCol = _mm256_mullo_epi32(o.vCol, _mm256_set1_epi32(nChan));
+    _mm512_storeu_si512(p, _mm512_add_epi64(vRow, _mm512_cvtepi32_epi64(vCol)));
+}
+
 inline F64 GatherNear(const double* p, const std::int64_t* o, int nShift) {
     const __m512i vPlace = _mm512_add_epi64(_mm512_loadu_si512(o), _mm512_set1_epi64(nShift));
     return {_mm512_permutex2var_pd(_mm512_loadu_pd(p), vPlace, _mm512_loadu_pd(p + kLanes))};

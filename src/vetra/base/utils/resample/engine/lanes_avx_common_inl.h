@@ -423,45 +423,43 @@ inline std::uint32_t GroupBits(const std::uint64_t* panRow, const BitGroup& oGro
     return ~static_cast<std::uint32_t>(_mm256_movemask_epi8(vNot));
 }
 
+inline void Store(std::int32_t* panCol, std::int32_t* panRow, const Cells& o) {
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(panCol), o.vCol);
+    _mm256_storeu_si256(reinterpret_cast<__m256i*>(panRow), o.vRow);
+}
+
 // Mostly the eight pixels lie in two bands and sixteen columns, from the first or the last of them
 // on: then two loads have all bits.
-inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch, F64 col, F64 row) {
-    const __m256i vCol = ToInt32(col);
-    const __m256i vRow = ToInt32(row);
-    const auto fnLesserEnd = [](__m256i v) {
-        return _mm256_min_epi32(_mm256_broadcastd_epi32(_mm256_castsi256_si128(v)),
-                                _mm256_permutevar8x32_epi32(v, _mm256_set1_epi32(kLanes - 1)));
+inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch,
+                         const std::int32_t* panCol, const std::int32_t* panRow) {
+    const auto fnLoad = [](const std::int32_t* p) {
+        return _mm256_loadu_si256(reinterpret_cast<const __m256i*>(p));
     };
-    const __m256i vFirstCol = fnLesserEnd(vCol);
-    const __m256i vFirstRow =
-        _mm256_and_si256(fnLesserEnd(vRow), _mm256_set1_epi32(~(kBandRows - 1)));
-    const __m256i vCols = _mm256_sub_epi32(vCol, vFirstCol);
-    const __m256i vRows = _mm256_sub_epi32(vRow, vFirstRow);
-    static_assert(kBandReach == 16 && 2 * kBandRows == 16);
-    if (_mm256_testz_si256(_mm256_or_si256(vCols, vRows), _mm256_set1_epi32(~15)) == 0) {
-        alignas(32) std::int32_t anCol[kLanes];
-        alignas(32) std::int32_t anRow[kLanes];
-        _mm256_store_si256(reinterpret_cast<__m256i*>(anCol), vCol);
-        _mm256_store_si256(reinterpret_cast<__m256i*>(anRow), vRow);
-        return PickBandBits(pabyMap, nPitch, anCol, anRow);
-    }
-    const auto fnLower = [](__m256i v) {
-        return std::int64_t{_mm_cvtsi128_si32(_mm256_castsi256_si128(v))};
+    const auto fnLesserEnd = [](const std::int32_t* p) {
+        return p[0] < p[kLanes - 1] ? p[0] : p[kLanes - 1];
     };
     static_assert(kBandRows == 1 << 3);
-    const unsigned char* p = pabyMap + (fnLower(vFirstRow) >> 3) * nPitch + fnLower(vFirstCol);
+    const std::int32_t nFirstCol = fnLesserEnd(panCol);
+    const std::int32_t nBand = fnLesserEnd(panRow) >> 3;
+    const __m256i vCols = _mm256_sub_epi32(fnLoad(panCol), _mm256_set1_epi32(nFirstCol));
+    const __m256i vRows = _mm256_sub_epi32(fnLoad(panRow), _mm256_set1_epi32(nBand << 3));
+    static_assert(kBandReach == 16 && 2 * kBandRows == 16);
+    if (_mm256_testz_si256(_mm256_or_si256(vCols, vRows), _mm256_set1_epi32(~15)) == 0) {
+        return PickBandBits(pabyMap, nPitch, panCol, panRow);
+    }
+    const unsigned char* p = pabyMap + nBand * nPitch + nFirstCol;
+    // The upper band in the lower half and the lower one in the upper half.
     const auto fnBand = [](const unsigned char* q) {
         return _mm_loadu_si128(reinterpret_cast<const __m128i*>(q));
     };
-    const __m128i vPlace = Narrow8<false>(vCols);
-    const __m128i vShift = Narrow8<false>(vRows);
+    const __m256i vBands = _mm256_set_m128i(fnBand(p + nPitch), fnBand(p));
     // Bits of the rows of either band.
-    const __m128i vUpper = _mm_set_epi64x(0, static_cast<long long>(0x8040201008040201u));
-    const __m128i vLower = _mm_set_epi64x(static_cast<long long>(0x8040201008040201u), 0);
-    const __m128i vFound = _mm_or_si128(
-        _mm_and_si128(_mm_shuffle_epi8(fnBand(p), vPlace), _mm_shuffle_epi8(vUpper, vShift)),
-        _mm_and_si128(_mm_shuffle_epi8(fnBand(p + nPitch), vPlace),
-                      _mm_shuffle_epi8(vLower, vShift)));
-    const int nNot = _mm_movemask_epi8(_mm_cmpeq_epi8(vFound, _mm_setzero_si128()));
-    return ~static_cast<unsigned>(nNot) & 0xffu;
+    constexpr auto nBits = static_cast<long long>(0x8040201008040201u);
+    const __m256i vBits = _mm256_set_epi64x(nBits, 0, 0, nBits);
+    const __m256i vFound = _mm256_and_si256(
+        _mm256_shuffle_epi8(vBands, _mm256_broadcastsi128_si256(Narrow8<false>(vCols))),
+        _mm256_shuffle_epi8(vBits, _mm256_broadcastsi128_si256(Narrow8<false>(vRows))));
+    const auto nNot = static_cast<unsigned>(
+        _mm256_movemask_epi8(_mm256_cmpeq_epi8(vFound, _mm256_setzero_si256())));
+    return ~(nNot & nNot >> 16) & 0xffu;
 }

@@ -253,10 +253,37 @@ inline std::uint32_t GroupBits(const std::uint64_t* panRow, const BitGroup& oGro
                                const std::int64_t* panCol) {
     return PickGroupBits(panRow, oGroup, panCol);
 }
-inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch, F64 col, F64 row) {
-    std::int64_t anCol[kLanes];
-    std::int64_t anRow[kLanes];
-    StoreIntegers(anCol, col);
-    StoreIntegers(anRow, row);
-    return PickBandBits(pabyMap, nPitch, anCol, anRow);
+
+// Eight pixels of a source: 0, 0 where they lie outside.
+struct Cells {
+    std::int32_t anCol[kLanes];
+    std::int32_t anRow[kLanes];
+    unsigned nInside;
+};
+inline Cells CellsInside(F64 col, F64 row, const CellLimits& o) {
+    Cells oCells{{}, {}, 0};
+    for (int i = 0; i < kLanes; ++i) {
+        const double dfCol = col.v[i / 2][i % 2] + o.nColOff;
+        const double dfRow = row.v[i / 2][i % 2] + o.nRowOff;
+        if (dfCol >= 0.0 && dfCol < o.nCols && dfRow >= 0.0 && dfRow < o.nRows) {
+            oCells.anCol[i] = static_cast<std::int32_t>(dfCol);
+            oCells.anRow[i] = static_cast<std::int32_t>(dfRow);
+            oCells.nInside |= 1u << i;
+        }
+    }
+    return oCells;
+}
+inline unsigned Bits(const Cells& o) { return o.nInside; }
+inline void StorePlaces(std::int64_t* p, const Cells& o, int nPitch, int nChan) {
+    for (int i = 0; i < kLanes; ++i) {
+        p[i] = std::int64_t{o.anRow[i]} * nPitch + std::int64_t{o.anCol[i]} * nChan;
+    }
+}
+inline void Store(std::int32_t* panCol, std::int32_t* panRow, const Cells& o) {
+    __builtin_memcpy(panCol, o.anCol, sizeof o.anCol);
+    __builtin_memcpy(panRow, o.anRow, sizeof o.anRow);
+}
+inline unsigned BandBits(const unsigned char* pabyMap, std::int64_t nPitch,
+                         const std::int32_t* panCol, const std::int32_t* panRow) {
+    return PickBandBits(pabyMap, nPitch, panCol, panRow);
 }

@@ -149,11 +149,16 @@ struct SpanBits {
     static constexpr int kWord = 64;
 
     // The bits of pixels i to i + 7.
-    void Add(int i, unsigned nBits) {
-        an[i / kWord] |= std::uint64_t{nBits & 0xffu} << (i % kWord);
-    }
+    void Set(int i, unsigned nBits) { Byte(i) = static_cast<unsigned char>(nBits); }
+    unsigned Get(int i) { return Byte(i); }
 
     std::uint64_t an[kSpanPixels / kWord] = {};
+
+ private:
+    unsigned char& Byte(int i) {
+        constexpr int kSwap = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__ ? 0 : 7;
+        return reinterpret_cast<unsigned char*>(an)[i / kLanes ^ kSwap];
+    }
 };
 
 // Writes classes of pixels, or the modes that belong to them, and keeps the set of what it wrote.
@@ -239,8 +244,8 @@ VETRA_STAGE unsigned MaskClasses(const ClassRules& oRules, const MaskBytes& oMas
         if (nFits != 0xff || oWriter.NearestDecides()) {
             nNear &= UsableBits(oRules, oMask, panNearest + i);
         }
-        oFits.Add(i, nFits);
-        oNear.Add(i, nNear);
+        oFits.Set(i, nFits);
+        oNear.Set(i, nNear);
     }
     return oWriter.Write(oFits, oNear);
 }
@@ -302,56 +307,96 @@ VETRA_STAGE unsigned RowClasses(const ClassRules& oRules, const MaskRow& oMask,
         .Write(oRules.bNeedsWhole ? oWhole : oInside, oNear);
 }
 
+inline CellLimits WindowLimits(const ClassLimits& o) {
+    const auto fnCount = [](double dfFirst, double dfLast) {
+        return dfFirst <= dfLast ? static_cast<int>(dfLast - dfFirst) + 1 : 0;
+    };
+    return {static_cast<int>(o.dfColOff), static_cast<int>(o.dfRowOff),
+            fnCount(o.dfFitColFirst, o.dfFitColLast), fnCount(o.dfFitRowFirst, o.dfFitRowLast)};
+}
+inline CellLimits NearestLimits(const ClassLimits& o) {
+    return {0, 0, static_cast<int>(o.dfNearColLast) + 1, static_cast<int>(o.dfNearRowLast) + 1};
+}
+
+// The cells of windows, or of nearest pixels, of a span, and which of them are inside.
+struct SpanCells {
+    alignas(64) std::int32_t anCol[kSpanPixels];
+    alignas(64) std::int32_t anRow[kSpanPixels];
+    SpanBits oInside;
+};
+
+template <bool kAnchorNearest>
+VETRA_STAGE void WindowCells(const ClassLimits& oClassLimits, int nPitch, int nChan,
+                             const double* padfCol, const double* padfRow, int nPix,
+                             SpanPlaces oPlaces, SpanCells& oSpanCells) {
+    const CellLimits oLimits = WindowLimits(oClassLimits);
+    for (int i = 0; i < nPix; i += kLanes) {
+        const F64 col = Load(padfCol + i);
+        const F64 row = Load(padfRow + i);
+        const F64 anchorCol = kAnchorNearest ? Nearest(col) : Floor(col);
+        const F64 anchorRow = kAnchorNearest ? Nearest(row) : Floor(row);
+        Store(oPlaces.padfFracCol + i, col - anchorCol);
+        Store(oPlaces.padfFracRow + i, row - anchorRow);
+        const Cells oCells = CellsInside(anchorCol, anchorRow, oLimits);
+        StorePlaces(oPlaces.panWindow + i, oCells, nPitch, nChan);
+        Store(oSpanCells.anCol + i, oSpanCells.anRow + i, oCells);
+        oSpanCells.oInside.Set(i, Bits(oCells));
+    }
+}
+
 VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const ClassRules& oRules,
-                                  const MaskBands& oMask, double dfPitch, double dfChan,
+                                  const MaskBands& oMask, int nPitch, int nChan,
                                   const double* padfCol, const double* padfRow, int nPix,
                                   const SpanPlaces& oPlaces) {
-    const Limits oLimits(oClassLimits);
     ClassWriter oWriter(oRules, nPix, oPlaces.pabyClassThenMode);
-    const F64 zero = Set1(0.0);
-    const F64 pitch = Set1(dfPitch);
-    const F64 chan = Set1(dfChan);
-    const F64 colOff = Set1(oClassLimits.dfColOff);
-    const F64 rowOff = Set1(oClassLimits.dfRowOff);
     SpanBits oFits;
     SpanBits oNear;
+    SpanCells oCells;
+    // Bits are looked up in loops of their own: what leads to them takes many steps, and the
+    // shorter a loop, the more of its rounds overlap.
+    if (oPlaces.panWindow != nullptr) {
+        const auto pfnCells =
+            oClassLimits.bAnchorNearest ? &WindowCells<true> : &WindowCells<false>;
+        pfnCells(oClassLimits, nPitch, nChan, padfCol, padfRow, nPix, oPlaces, oCells);
+        const unsigned char* pabyWhole = oMask.pabyWhole;
+        const std::int64_t nBandPitch = oMask.nPitch;
+        for (int i = 0; i < nPix; i += kLanes) {
+            const unsigned nWhole =
+                BandBits(pabyWhole, nBandPitch, oCells.anCol + i, oCells.anRow + i);
+            oFits.Set(i, oCells.oInside.Get(i) & nWhole);
+        }
+        if (oPlaces.pabyBroken != nullptr) {
+            for (int i = 0; i < nPix; i += kLanes) {
+                StoreBits(oPlaces.pabyBroken + i, oCells.oInside.Get(i) & ~oFits.Get(i), 0u);
+            }
+        }
+        if (!oRules.bNeedsWhole) {
+            oFits = oCells.oInside;
+        }
+    }
     // Groups whose nearest pixels matter; a branch for each would be foreseen badly.
     const bool bNearestDecides = oWriter.NearestDecides();
     int anOther[kSpanPixels / kLanes];
     int nOthers = 0;
     for (int i = 0; i < nPix; i += kLanes) {
-        unsigned nFits = 0;
-        if (oPlaces.panWindow != nullptr) {
-            const F64 col = Load(padfCol + i);
-            const F64 row = Load(padfRow + i);
-            const B64 fit = oLimits.Fit(col, row);
-            const F64 anchorCol = Anchor(oClassLimits, col);
-            const F64 anchorRow = Anchor(oClassLimits, row);
-            const F64 windowCol = Select(fit, anchorCol + colOff, zero);
-            const F64 windowRow = Select(fit, anchorRow + rowOff, zero);
-            StoreIntegers(oPlaces.panWindow + i, windowRow * pitch + windowCol * chan);
-            Store(oPlaces.padfFracCol + i, col - anchorCol);
-            Store(oPlaces.padfFracRow + i, row - anchorRow);
-            nFits = Bits(fit);
-            const unsigned nWhole = BandBits(oMask.pabyWhole, oMask.nPitch, windowCol, windowRow);
-            if (oPlaces.pabyBroken != nullptr) {
-                StoreBits(oPlaces.pabyBroken + i, nFits & ~nWhole, 0u);
-            }
-            nFits &= oRules.bNeedsWhole ? nWhole : 0xffu;
-        }
-        oFits.Add(i, nFits);
         anOther[nOthers] = i;
-        nOthers += nFits != 0xff || bNearestDecides ? 1 : 0;
+        nOthers += oFits.Get(i) != 0xff || bNearestDecides ? 1 : 0;
     }
+    const CellLimits oLimits = NearestLimits(oClassLimits);
     for (int k = 0; k < nOthers; ++k) {
         const int i = anOther[k];
-        const F64 col = Load(padfCol + i);
-        const F64 row = Load(padfRow + i);
-        const B64 near = oLimits.Near(col, row);
-        const F64 nearCol = Select(near, Nearest(col), zero);
-        const F64 nearRow = Select(near, Nearest(row), zero);
-        StoreIntegers(oPlaces.panNearest + i, nearRow * pitch + nearCol * chan);
-        oNear.Add(i, Bits(near) & BandBits(oMask.pabyUsable, oMask.nPitch, nearCol, nearRow));
+        const Cells o =
+            CellsInside(Nearest(Load(padfCol + i)), Nearest(Load(padfRow + i)), oLimits);
+        StorePlaces(oPlaces.panNearest + i, o, nPitch, nChan);
+        Store(oCells.anCol + i, oCells.anRow + i, o);
+        oCells.oInside.Set(i, Bits(o));
+    }
+    const unsigned char* pabyUsable = oMask.pabyUsable;
+    const std::int64_t nBandPitch = oMask.nPitch;
+    for (int k = 0; k < nOthers; ++k) {
+        const int i = anOther[k];
+        oNear.Set(i, oCells.oInside.Get(i) &
+                         BandBits(pabyUsable, nBandPitch, oCells.anCol + i, oCells.anRow + i));
     }
     return oWriter.Write(oFits, oNear);
 }
@@ -392,8 +437,8 @@ VETRA_STAGE unsigned OpenModes(const ClassLimits& oClassLimits, bool bWindow,
         const F64 col = Load(padfCol + i);
         const F64 row = Load(padfRow + i);
         const unsigned nFit = bWindow ? Bits(oLimits.Fit(col, row)) : 0u;
-        oFits.Add(i, nFit);
-        oNear.Add(i, nFit == 0xffu ? 0u : Bits(oLimits.Near(col, row)));
+        oFits.Set(i, nFit);
+        oNear.Set(i, nFit == 0xffu ? 0u : Bits(oLimits.Near(col, row)));
     }
     return ClassWriter({abyModeOfClass, false, false}, nPix, pabyMode).Write(oFits, oNear);
 }

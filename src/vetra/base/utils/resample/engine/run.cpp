@@ -1,5 +1,6 @@
 #include "vetra/base/utils/resample/engine/run.h"
 
+#include <algorithm>
 #include <cstring>
 
 namespace vetra::utils::engine {
@@ -89,7 +90,13 @@ Run::ThreadMemory Run::MakeThreadMemory() const {
             oMemory.padfScratch = MakeAlignedDoubles(GetScratchSize(moMethod));
         }
         if (moTask.oOptions.ePath != Path::ePlain && moTask.pabySrcMask != nullptr) {
-            oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages, moColumns.vdfFrac.empty());
+            const bool bBands = moColumns.vdfFrac.empty();
+            // Bands are for places that 32-bit integers can hold, with as much left for the offsets
+            // of windows.
+            constexpr long long nMost = 1 << 30;
+            if (!bBands || std::max<long long>(mnPitch, moTask.nSrcRows) <= nMost) {
+                oMemory.poMap = std::make_unique<MaskMap>(moTask, moStages, bBands);
+            }
         }
     }
     return oMemory;

@@ -71,7 +71,7 @@ void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
     Span& oSpan = oArrays.oSpan;
     const bool bReplacing = moMethod.eRule == ModeRule::eReplacingWindow;
     oSpan.nModes = moStages.pfnMappedPlaces(
-        moLimits, GetClassRules(), oMap.GetBands(), static_cast<double>(mnPitch), moTask.nChan,
+        moLimits, GetClassRules(), oMap.GetBands(), static_cast<int>(mnPitch), moTask.nChan,
         oArrays.adfCol, oArrays.adfRow, oSpan.nPix,
         {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr,
          moMethod.eValues != eVR_NONE ? oArrays.anWindow : nullptr, oArrays.anNearest,

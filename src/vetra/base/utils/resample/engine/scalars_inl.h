@@ -56,9 +56,8 @@ inline std::uint32_t PickGroupBits(const std::uint64_t* panRow, const BitGroup& 
 }
 
 // Bits of eight pixels in bands.
-template <typename Integer>
 inline unsigned PickBandBits(const unsigned char* pabyMap, std::int64_t nPitch,
-                             const Integer* panCol, const Integer* panRow) {
+                             const std::int32_t* panCol, const std::int32_t* panRow) {
     unsigned nBits = 0;
     for (int i = 0; i < kLanes; ++i) {
         const unsigned nByte = pabyMap[panRow[i] / kBandRows * nPitch + panCol[i]];

@@ -105,6 +105,15 @@ struct MaskBands {
 constexpr int kBandRows = 8;
 constexpr int kBandReach = 16;
 
+/// Where windows, or nearest pixels, begin: nColOff columns and nRowOff rows from the anchor on,
+/// which is inside where that is one of the first nCols columns and nRows rows.
+struct CellLimits {
+    int nColOff;
+    int nRowOff;
+    int nCols;
+    int nRows;
+};
+
 /// Of each pixel of a span what becomes of it, and the places of its window and nearest pixel.
 struct SpanPlaces {
     unsigned char* pabyClassThenMode;
@@ -348,7 +357,7 @@ struct LevelStages {
     /// pfnMaskClasses, pfnWindows and pfnNearestPlaces, but places are given for all windows that
     /// fit, and nearest ones only in groups in which the class of one pixel depends on it.
     unsigned (*pfnMappedPlaces)(const ClassLimits& oLimits, const ClassRules& oRules,
-                                const MaskBands& oMask, double dfPitch, double dfChan,
+                                const MaskBands& oMask, int nPitch, int nChan,
                                 const double* padfCol, const double* padfRow, int nPix,
                                 const SpanPlaces& oPlaces);
     /// Modes where every request is 1 and no source pixel is masked, from the positions: 1 where

@@ -21,7 +21,12 @@
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
 //                                neither of two adjacent bytes is 0
 //   GroupBits                    bits: which of a BitGroup's columns a row of bits has
-//   BandBits                     bits: which of eight pixels bands of bits have, as MaskBands
+//   Cells                        eight pixels of the source, the first one where a pixel is outside
+//   CellsInside Bits             pixels of whole columns and rows, NaN included, that CellLimits
+//                                have; which ones are inside, as bits
+//   StorePlaces                  their offsets, of so many samples a row and a pixel; Store keeps
+//                                their columns and rows
+//   BandBits                     bits: which of them bands of bits have, as MaskBands
 //   StoreBits AddBits            64 bytes: bit 0 of each from one word, bit 1 from another; one bit
 //                                of each, among those that are set
 //   EqualBits                    bits: which of 64 bytes have a value
