@@ -60,6 +60,28 @@ inline void StorePlaces(std::int64_t* p, B64 lanes, F64 place) {
     StoreIntegers(p, Select(lanes, place, Set1(0.0)));
 }
 
+// The groups of a span for which fnCondition holds, of their first pixels. Takes no branch for
+// each, which would be foreseen badly.
+class GroupList {
+ public:
+    template <typename Condition>
+    GroupList(int nPix, const Condition& fnCondition) {
+        int nCount = 0;
+        for (int i = 0; i < nPix; i += kLanes) {
+            manFirst[nCount] = i;
+            nCount += fnCondition(i) ? 1 : 0;
+        }
+        mnCount = nCount;
+    }
+    // The groups' first pixels.
+    const int* begin() const { return manFirst; }
+    const int* end() const { return manFirst + mnCount; }
+
+ private:
+    int manFirst[kSpanPixels / kLanes];
+    int mnCount;
+};
+
 // The pixel from which a window's offsets count.
 inline F64 Anchor(const ClassLimits& oLimits, F64 pos) {
     return oLimits.bAnchorNearest ? Nearest(pos) : Floor(pos);
@@ -146,13 +168,11 @@ inline unsigned UsableBits(const ClassRules& oRules, const MaskBytes& oMask,
 
 // A bit for each pixel of a span.
 struct SpanBits {
-    static constexpr int kWord = 64;
-
     // The bits of pixels i to i + 7.
     void Set(int i, unsigned nBits) { Byte(i) = static_cast<unsigned char>(nBits); }
     unsigned Get(int i) { return Byte(i); }
 
-    std::uint64_t an[kSpanPixels / kWord] = {};
+    std::uint64_t an[kSpanWords] = {};
 
  private:
     unsigned char& Byte(int i) {
@@ -182,8 +202,8 @@ class ClassWriter {
 
     // Writes all pixels. Returns the set.
     unsigned Write(const SpanBits& oFits, const SpanBits& oNear) {
-        for (int i = 0; i < mnPix; i += SpanBits::kWord) {
-            WriteWord(i, oFits.an[i / SpanBits::kWord], oNear.an[i / SpanBits::kWord]);
+        for (int i = 0; i < mnPix; i += kWordPixels) {
+            WriteWord(i, oFits.an[i / kWordPixels], oNear.an[i / kWordPixels]);
         }
         unsigned nSet = 0;
         for (int k = 0; k < 4; ++k) {
@@ -196,12 +216,12 @@ class ClassWriter {
     void WriteWord(int i, std::uint64_t nFits, std::uint64_t nNear) {
         // Mostly all pixels are of one class, and those behind the last one may be what they like.
         const std::uint64_t nExist =
-            mnPix - i < SpanBits::kWord ? (std::uint64_t{1} << (mnPix - i)) - 1 : ~std::uint64_t{0};
+            mnPix - i < kWordPixels ? (std::uint64_t{1} << (mnPix - i)) - 1 : ~std::uint64_t{0};
         nFits &= nExist;
         nNear &= nExist;
         if ((nFits == 0 || nFits == nExist) && (nNear == 0 || nNear == nExist)) {
             const int nClass = (nFits != 0 ? kClassFits : 0) | (nNear != 0 ? kClassNear : 0);
-            __builtin_memset(mpaby + i, mabyWritten[nClass], SpanBits::kWord);
+            __builtin_memset(mpaby + i, mabyWritten[nClass], kWordPixels);
             manFound[nClass] = 1;
             return;
         }
@@ -250,11 +270,16 @@ VETRA_STAGE unsigned MaskClasses(const ClassRules& oRules, const MaskBytes& oMas
     return oWriter.Write(oFits, oNear);
 }
 
+inline void StoreBroken(const SpanBits& oInside, const SpanBits& oWhole, std::uint64_t* panBroken) {
+    for (int k = 0; k < kSpanWords; ++k) {
+        panBroken[k] = oInside.an[k] & ~oWhole.an[k];
+    }
+}
+
 // The bits of target columns from nCol on, which fnGroup gives for each group.
 template <typename Function>
 inline SpanBits RowBits(int nCol, int nPix, const Function& fnGroup) {
     constexpr int kColumns = BitGroup::kColumns;
-    constexpr int kWord = SpanBits::kWord;
     SpanBits oBits;
     const int nShift = nCol % kColumns;
     int i = -nShift;
@@ -264,11 +289,11 @@ inline SpanBits RowBits(int nCol, int nPix, const Function& fnGroup) {
             oBits.an[0] = nGroup >> nShift;
             continue;
         }
-        oBits.an[i / kWord] |= nGroup << (i % kWord);
+        oBits.an[i / kWordPixels] |= nGroup << (i % kWordPixels);
         // A group may begin in one word and end in the next.
-        const int nNext = (i + kColumns - 1) / kWord;
-        if (nNext != i / kWord && nNext < kSpanPixels / kWord) {
-            oBits.an[nNext] = nGroup >> (kWord - i % kWord);
+        const int nNext = (i + kColumns - 1) / kWordPixels;
+        if (nNext != i / kWordPixels && nNext < kSpanWords) {
+            oBits.an[nNext] = nGroup >> (kWordPixels - i % kWordPixels);
         }
     }
     return oBits;
@@ -276,7 +301,7 @@ inline SpanBits RowBits(int nCol, int nPix, const Function& fnGroup) {
 
 VETRA_STAGE unsigned RowClasses(const ClassRules& oRules, const MaskRow& oMask,
                                 unsigned char nRowClass, int nCol, int nPix,
-                                unsigned char* pabyClassThenMode, unsigned char* pabyBroken) {
+                                unsigned char* pabyClassThenMode, std::uint64_t* panBroken) {
     SpanBits oInside;
     SpanBits oWhole;
     SpanBits oNear;
@@ -284,7 +309,7 @@ VETRA_STAGE unsigned RowClasses(const ClassRules& oRules, const MaskRow& oMask,
         if (!oRules.bNeedsWhole) {
             oInside = RowBits(nCol, nPix, [&](int g) { return oMask.poWholeGroups[g].nInside; });
         }
-        if (oRules.bNeedsWhole || pabyBroken != nullptr) {
+        if (oRules.bNeedsWhole || panBroken != nullptr) {
             oWhole = RowBits(nCol, nPix, [&](int g) {
                 return GroupBits(oMask.panWhole, oMask.poWholeGroups[g],
                                  oMask.panWindowCol + g * BitGroup::kColumns);
@@ -297,11 +322,8 @@ VETRA_STAGE unsigned RowClasses(const ClassRules& oRules, const MaskRow& oMask,
                              oMask.panNearestCol + g * BitGroup::kColumns);
         });
     }
-    if (pabyBroken != nullptr) {
-        for (int k = 0; k * SpanBits::kWord < nPix; ++k) {
-            StoreBits(pabyBroken + k * SpanBits::kWord, oInside.an[k] & ~oWhole.an[k],
-                      std::uint64_t{0});
-        }
+    if (panBroken != nullptr) {
+        StoreBroken(oInside, oWhole, panBroken);
     }
     return ClassWriter(oRules, nPix, pabyClassThenMode)
         .Write(oRules.bNeedsWhole ? oWhole : oInside, oNear);
@@ -348,57 +370,46 @@ VETRA_STAGE unsigned MappedPlaces(const ClassLimits& oClassLimits, const ClassRu
                                   const MaskBands& oMask, int nPitch, int nChan,
                                   const double* padfCol, const double* padfRow, int nPix,
                                   const SpanPlaces& oPlaces) {
-    ClassWriter oWriter(oRules, nPix, oPlaces.pabyClassThenMode);
-    SpanBits oFits;
+    SpanBits oWhole;
     SpanBits oNear;
     SpanCells oCells;
     // Bits are looked up in loops of their own: what leads to them takes many steps, and the
     // shorter a loop, the more of its rounds overlap.
+    const std::int64_t nBandPitch = oMask.nPitch;
     if (oPlaces.panWindow != nullptr) {
         const auto pfnCells =
             oClassLimits.bAnchorNearest ? &WindowCells<true> : &WindowCells<false>;
         pfnCells(oClassLimits, nPitch, nChan, padfCol, padfRow, nPix, oPlaces, oCells);
         const unsigned char* pabyWhole = oMask.pabyWhole;
-        const std::int64_t nBandPitch = oMask.nPitch;
         for (int i = 0; i < nPix; i += kLanes) {
             const unsigned nWhole =
                 BandBits(pabyWhole, nBandPitch, oCells.anCol + i, oCells.anRow + i);
-            oFits.Set(i, oCells.oInside.Get(i) & nWhole);
+            oWhole.Set(i, oCells.oInside.Get(i) & nWhole);
+            oNear.Set(i, oCells.oInside.Get(i) & nWhole);
         }
-        if (oPlaces.pabyBroken != nullptr) {
-            for (int i = 0; i < nPix; i += kLanes) {
-                StoreBits(oPlaces.pabyBroken + i, oCells.oInside.Get(i) & ~oFits.Get(i), 0u);
-            }
-        }
-        if (!oRules.bNeedsWhole) {
-            oFits = oCells.oInside;
+        if (oPlaces.panBroken != nullptr) {
+            StoreBroken(oCells.oInside, oWhole, oPlaces.panBroken);
         }
     }
-    // Groups whose nearest pixels matter; a branch for each would be foreseen badly.
-    const bool bNearestDecides = oWriter.NearestDecides();
-    int anOther[kSpanPixels / kLanes];
-    int nOthers = 0;
-    for (int i = 0; i < nPix; i += kLanes) {
-        anOther[nOthers] = i;
-        nOthers += oFits.Get(i) != 0xff || bNearestDecides ? 1 : 0;
-    }
+    // Where all requests are 1, a whole window decides: alone, or with its nearest pixel, which is
+    // as valid as the rest.
+    const bool bAll = oRules.pabyModeOfClass == nullptr;
+    const GroupList oOthers(nPix, [&](int i) { return bAll || oWhole.Get(i) != 0xff; });
     const CellLimits oLimits = NearestLimits(oClassLimits);
-    for (int k = 0; k < nOthers; ++k) {
-        const int i = anOther[k];
+    for (const int i : oOthers) {
         const Cells o =
             CellsInside(Nearest(Load(padfCol + i)), Nearest(Load(padfRow + i)), oLimits);
         StorePlaces(oPlaces.panNearest + i, o, nPitch, nChan);
         Store(oCells.anCol + i, oCells.anRow + i, o);
-        oCells.oInside.Set(i, Bits(o));
+        oNear.Set(i, Bits(o));
     }
     const unsigned char* pabyUsable = oMask.pabyUsable;
-    const std::int64_t nBandPitch = oMask.nPitch;
-    for (int k = 0; k < nOthers; ++k) {
-        const int i = anOther[k];
-        oNear.Set(i, oCells.oInside.Get(i) &
-                         BandBits(pabyUsable, nBandPitch, oCells.anCol + i, oCells.anRow + i));
+    for (const int i : oOthers) {
+        oNear.Set(
+            i, oNear.Get(i) & BandBits(pabyUsable, nBandPitch, oCells.anCol + i, oCells.anRow + i));
     }
-    return oWriter.Write(oFits, oNear);
+    return ClassWriter(oRules, nPix, oPlaces.pabyClassThenMode)
+        .Write(oRules.bNeedsWhole ? oWhole : oCells.oInside, oNear);
 }
 
 VETRA_STAGE void MaskBits(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,

@@ -35,10 +35,10 @@ struct Span {
     const double* padfFracRow = nullptr;
     const unsigned char* pabyWindowMask = nullptr;
     const PairGroup* poGroups = nullptr;
-    // How the values are made; those of windows with replaced samples, which have a byte of 1 here,
-    // are made once more as the method says.
+    // How the values are made; those of windows with replaced samples, which have a bit here, are
+    // made once more as the method says.
     ValuesRow eValues = eVR_NONE;
-    const unsigned char* pabyBroken = nullptr;
+    const std::uint64_t* panBroken = nullptr;
     // Has the values of the windows where it isn't null; else they are made of source samples.
     RowCache* poRows = nullptr;
     int nFirstCol = 0;
@@ -58,7 +58,7 @@ struct SpanArrays {
     alignas(64) std::int64_t anWindow[kSpanArray] = {};
     alignas(64) std::int64_t anNearest[kSpanArray] = {};
     alignas(64) unsigned char abyMode[kSpanArray] = {};
-    alignas(64) unsigned char abyBroken[kSpanArray] = {};
+    std::uint64_t anBroken[kSpanWords] = {};
 };
 
 // The windows of some pixels of a span, packed; in whole groups, nothing behind which is looked at.

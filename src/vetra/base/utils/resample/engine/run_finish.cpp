@@ -1,5 +1,6 @@
 // What all spans end with: values, samples, and their way into the target.
 
+#include <bit>
 #include <cstring>
 
 #include "vetra/base/utils/resample/engine/run.h"
@@ -11,11 +12,17 @@ namespace {
 // Picks the broken windows out of a span.
 void Pack(const Span& oSpan, PackedWindows& oBroken) {
     int n = 0;
-    for (int i = 0; i < oSpan.nPix; ++i) {
-        // A branch would be foreseen badly.
-        oBroken.anPixel[n] = i;
-        n += static_cast<int>(oSpan.pabyBroken[i] != 0) &
-             static_cast<int>(oSpan.pabyMode[i] == ePO_INTERPOLATED);
+    for (int nFirst = 0; nFirst < oSpan.nPix; nFirst += kWordPixels) {
+        std::uint64_t nBits = oSpan.panBroken[nFirst / kWordPixels];
+        if (oSpan.nPix - nFirst < kWordPixels) {
+            nBits &= (std::uint64_t{1} << (oSpan.nPix - nFirst)) - 1;
+        }
+        for (; nBits != 0; nBits &= nBits - 1) {
+            const int i = nFirst + std::countr_zero(nBits);
+            // A branch would be foreseen badly.
+            oBroken.anPixel[n] = i;
+            n += oSpan.pabyMode[i] == ePO_INTERPOLATED ? 1 : 0;
+        }
     }
     oBroken.nPix = n;
     // Whole groups are computed.
@@ -69,7 +76,7 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
     oWindows.pParameters = moTask.pParameters;
     oWindows.padfScratch = oMemory.padfScratch.get();
     PackedWindows& oBroken = oValues.oBroken;
-    if (oSpan.pabyBroken != nullptr) {
+    if (oSpan.panBroken != nullptr) {
         Pack(oSpan, oBroken);
     }
     const bool bAll = (oSpan.nModes & kSetUntouched) == 0;
@@ -88,7 +95,7 @@ void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oV
             pfnValues(oWindows, oSpan.pWindowSrc + std::ptrdiff_t{nChannel} * mnSrcBytes,
                       padfValue);
         }
-        if (oSpan.pabyBroken != nullptr && oBroken.nPix != 0) {
+        if (oSpan.panBroken != nullptr && oBroken.nPix != 0) {
             ReplaceBroken(oSpan, nChannel, oWindows, oBroken, padfValue);
         }
         for (int i = 0; i < mnChannels; ++i) {

@@ -30,7 +30,7 @@ void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArray
     oSpan.padfFracCol = oArrays.adfFracCol;
     oSpan.padfFracRow = oArrays.adfFracRow;
     oSpan.eValues = moMethod.eValues;
-    oSpan.pabyBroken = nullptr;
+    oSpan.panBroken = nullptr;
 
     moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
     if (poMap != nullptr && Provides(*poMap, oArrays)) {
@@ -73,13 +73,13 @@ void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
     oSpan.nModes = moStages.pfnMappedPlaces(
         moLimits, GetClassRules(), oMap.GetBands(), static_cast<int>(mnPitch), moTask.nChan,
         oArrays.adfCol, oArrays.adfRow, oSpan.nPix,
-        {oArrays.abyMode, bReplacing ? oArrays.abyBroken : nullptr,
+        {oArrays.abyMode, bReplacing ? oArrays.anBroken : nullptr,
          moMethod.eValues != eVR_NONE ? oArrays.anWindow : nullptr, oArrays.anNearest,
          oArrays.adfFracCol, oArrays.adfFracRow});
     oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, oSpan.nModes, oArrays.abyMode);
     if (bReplacing) {
         oSpan.eValues = PlainRow(moMethod);
-        oSpan.pabyBroken = oArrays.abyBroken;
+        oSpan.panBroken = oArrays.anBroken;
     }
 }
 

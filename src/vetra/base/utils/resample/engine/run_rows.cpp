@@ -82,7 +82,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
     RowCache* poRows = bReplacing && !bMapped ? nullptr : oMemory.poRows.get();
     bool bFetched = false;
     alignas(64) unsigned char abyMode[kSpanArray];
-    alignas(64) unsigned char abyBroken[kSpanArray];
+    std::uint64_t anBroken[kSpanWords];
     for (int nDone = 0; nDone < nNumCols; nDone += kSpanPixels) {
         const std::size_t nCol = static_cast<std::size_t>(nFirstCol + nDone);
         oSpan.nFirst = nFirst + nDone;
@@ -101,7 +101,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             if (bMapped) {
                 const unsigned nModes = moStages.pfnRowClasses(
                     GetClassRules(), oMask, nRowClass, static_cast<int>(nCol), oSpan.nPix, abyMode,
-                    bReplacing ? abyBroken : nullptr);
+                    bReplacing ? anBroken : nullptr);
                 oSpan.nModes = ApplyRequests(oSpan.nFirst, oSpan.nPix, nModes, abyMode);
             } else {
                 const unsigned char* pabyClass = moColumns.vbyClass.data() + nCol;
@@ -114,7 +114,7 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
             }
             if (bReplacing && bMapped) {
                 oSpan.eValues = PlainRow(moMethod);
-                oSpan.pabyBroken = abyBroken;
+                oSpan.panBroken = anBroken;
             }
         }
         if (poRows != nullptr && (oSpan.nModes & kSetInterpolated) != 0) {

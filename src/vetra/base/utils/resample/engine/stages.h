@@ -17,6 +17,9 @@ constexpr int kLanes = 8;
 constexpr int kAlignment = 64;
 /// Size of a span's arrays: stages may write up to the end of the last group.
 constexpr int kSpanArray = kSpanPixels + kLanes;
+/// Where a span has a bit for each pixel: pixels of a word, and words.
+constexpr int kWordPixels = 64;
+constexpr int kSpanWords = kSpanPixels / kWordPixels;
 /// Channels whose values a stage may make at once.
 constexpr int kMostChannelsAtOnce = 4;
 
@@ -117,8 +120,9 @@ struct CellLimits {
 /// Of each pixel of a span what becomes of it, and the places of its window and nearest pixel.
 struct SpanPlaces {
     unsigned char* pabyClassThenMode;
-    /// 1 for pixels whose windows fit but aren't whole, else 0. May be null.
-    unsigned char* pabyBroken;
+    /// A bit for each pixel, kWordPixels a word, set where the window fits but isn't whole. May be
+    /// null.
+    std::uint64_t* panBroken;
     /// Null for a method without windows.
     std::int64_t* panWindow;
     std::int64_t* panNearest;
@@ -339,11 +343,11 @@ struct LevelStages {
                                const std::int64_t* panWindow, const std::int64_t* panNearest,
                                int nPix, unsigned char* pabyClassThenMode);
     /// Classes or modes of target columns from nCol on, where all windows lie in one row and all
-    /// nearest pixels, from the class of that row; and 1 for pixels whose windows fit but aren't
-    /// whole, else 0 (pabyBroken may be null).
+    /// nearest pixels, from the class of that row; and bits for pixels whose windows fit but
+    /// aren't whole, as in SpanPlaces.
     unsigned (*pfnRowClasses)(const ClassRules& oRules, const MaskRow& oMask,
                               unsigned char nRowClass, int nCol, int nPix,
-                              unsigned char* pabyClassThenMode, unsigned char* pabyBroken);
+                              unsigned char* pabyClassThenMode, std::uint64_t* panBroken);
     /// Bits of nCount mask bytes, set where they are nValue (bEqual) or aren't; and zeros up to a
     /// whole word.
     void (*pfnMaskBits)(const unsigned char* pabyMask, std::int64_t nCount, unsigned char nValue,

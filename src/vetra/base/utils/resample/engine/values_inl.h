@@ -91,12 +91,15 @@ VETRA_STAGE void NearestValues(const void* pSrc, const std::int64_t* panOffset,
         // Not as a Select: Clang 14 makes a maximum of that which takes the sign of -0.0 away.
         return kNonNegative ? ZeroWhere(Set1(0.0) > sample, sample) : sample;
     };
-    for (int i = 0; i < nPix; i += kLanes) {
-        if (pabyMode == nullptr) {
+    if (pabyMode == nullptr) {
+        for (int i = 0; i < nPix; i += kLanes) {
             Store(padfValue + i, fnNearest(i));
-        } else if (AnyByteEquals(pabyMode + i, 2)) {
-            Store(padfValue + i,
-                  Select(BytesEqual(pabyMode + i, 2), fnNearest(i), Load(padfValue + i)));
         }
+        return;
+    }
+    const GroupList oGroups(nPix, [&](int i) { return AnyByteEquals(pabyMode + i, 2); });
+    for (const int i : oGroups) {
+        Store(padfValue + i,
+              Select(BytesEqual(pabyMode + i, 2), fnNearest(i), Load(padfValue + i)));
     }
 }
