@@ -101,7 +101,7 @@ VETRA_STAGE void Across(const RowWindows& oRows, const double* padfRow, double* 
 
 template <bool kSquared>
 inline void StoreRowValue(double* p, F64 value) {
-    StoreValue(p, kSquared ? value * value : value);
+    Store(p, WithOneNaN(kSquared ? value * value : value));
 }
 
 // Values from filtered rows.

@@ -15,8 +15,21 @@ struct Squared {
 
 // Which bits a NaN gets from arithmetic depends on the processor and on the order of operands,
 // which a compiler may exchange.
+inline F64 WithOneNaN(F64 value) { return Select(value == value, value, Set1(__builtin_nan(""))); }
+
+// Methods that make numbers of whole numbers.
+template <typename Method>
+inline constexpr bool kKeepsNumbers = false;
+template <>
+inline constexpr bool kKeepsNumbers<Bilinear> = true;
+template <>
+inline constexpr bool kKeepsNumbers<Cubic> = true;
+template <>
+inline constexpr bool kKeepsNumbers<Separable<Lagrange4Filter>> = true;
+
+template <typename Method, typename T>
 inline void StoreValue(double* p, F64 value) {
-    Store(p, Select(value == value, value, Set1(__builtin_nan(""))));
+    Store(p, kKeepsNumbers<Method> && !kIsFloating<T> ? value : WithOneNaN(value));
 }
 
 // Calls fnGroup with the first pixel of each group of eight that has a window, the window reader
@@ -41,11 +54,11 @@ void ValuesLoop(const WindowSpan& oSpan, const T* pSrc, double* padfValue) {
                     oSpan.poGroups != nullptr ? oSpan.poGroups + i / kLanes : nullptr;
                 if (poGroup != nullptr && poGroup->nOffset >= 0) {
                     const GroupReader<T> oGroup{pSrc, poGroup, oSpan.nPitch};
-                    StoreValue(padfValue + i, Method::Value(oGroup, dx, dy));
+                    StoreValue<Method, T>(padfValue + i, Method::Value(oGroup, dx, dy));
                     return;
                 }
             }
-            StoreValue(padfValue + i, Method::Value(oWindow, dx, dy));
+            StoreValue<Method, T>(padfValue + i, Method::Value(oWindow, dx, dy));
         });
 }
 
@@ -64,8 +77,8 @@ VETRA_STAGE void ComplexValues(const WindowSpan& oSpan, const void* pSrc, double
                                F64 re;
                                F64 im;
                                Method::Value(oWindow, dx, dy, re, im);
-                               StoreValue(padfValue + i, re);
-                               StoreValue(padfValue + kSpanArray + i, im);
+                               StoreValue<Method, T>(padfValue + i, re);
+                               StoreValue<Method, T>(padfValue + kSpanArray + i, im);
                            });
 }
 
@@ -77,7 +90,8 @@ VETRA_STAGE void BilinearPixels(const WindowSpan& oSpan, const void* pSrc, doubl
                                F64 value[kNumChan];
                                Bilinear::Values(oWindow, dx, dy, value);
                                for (int c = 0; c < kNumChan; ++c) {
-                                   StoreValue(padfValue + c * kSpanArray + i, value[c]);
+                                   StoreValue<Bilinear, T>(padfValue + c * kSpanArray + i,
+                                                           value[c]);
                                }
                            });
 }
