@@ -11,6 +11,7 @@
 #include <limits>
 #include <memory>
 #include <random>
+#include <utility>
 #include <vector>
 
 #include "randomimages.h"
@@ -282,6 +283,66 @@ TEST_P(Exactness, ScalesEqualPlainEvaluation) {
                         << nSrcCols << " columns, type " << eType;
                 }
             }
+        }
+    }
+}
+
+// All positions of a turned image lie inside the source, but for one of a span, which lies at an
+// edge, outside or nowhere.
+TEST_P(Exactness, OddPositionsAmongInnerOnesEqualPlainEvaluation) {
+    constexpr int kSrcCols = 90;
+    constexpr int kSrcRows = 70;
+    constexpr int kTgtCols = 300;
+    constexpr int kTgtRows = 3;
+    Random oRandom(17);
+    const ResampleInfo oInfo = MakeResampler(GetParam())->GetResampleInfo();
+    std::vector<float> vfOdd = {40.0f, NAN, INFINITY, -INFINITY, 3e38f, -3e38f, 2147483648.0f};
+    for (const int nSize : {kSrcCols, kSrcRows}) {
+        for (const float fEdge : {0.0f, static_cast<float>(nSize)}) {
+            for (float fShift = -9.0f; fShift <= 9.0f; fShift += 0.5f) {
+                vfOdd.push_back(fEdge + fShift);
+                vfOdd.push_back(std::nextafter(fEdge + fShift, -1000.0f));
+            }
+        }
+    }
+    for (const NativeDataTypeCode eType : {eDT_C16S, eDT_8U, eDT_32R}) {
+        if ((GetParam() == eRM_CPLXSAR) != DataTypeAdapter::IsComplex(eType)) continue;
+        Image oSrc(eType, kSrcCols, kSrcRows, 1, false);
+        FillSamples(oRandom, RealView(oSrc.oBuffer).GetDatatype(), oSrc.oSamples.Get(),
+                    oSrc.oSamples.Size() / static_cast<std::size_t>(DataTypeAdapter::ByteSize(
+                                               RealView(oSrc.oBuffer).GetDatatype())));
+        std::vector<float> vfCol(kTgtCols * kTgtRows);
+        std::vector<float> vfRow(vfCol.size());
+        for (std::size_t i = 0; i < vfCol.size(); ++i) {
+            const auto x = static_cast<float>(i % kTgtCols);
+            const auto y = static_cast<float>(i / kTgtCols);
+            vfCol[i] = 20.0f + 0.15f * x + 3.1f * y;
+            vfRow[i] = 50.0f - 0.1f * x + 0.9f * y;
+        }
+        for (const float fOdd : vfOdd) {
+            const auto nAt = static_cast<std::size_t>(oRandom.Int(0, kTgtCols * kTgtRows - 1));
+            float& fPosition = oRandom.Chance(0.5) ? vfCol[nAt] : vfRow[nAt];
+            const float fInner = std::exchange(fPosition, fOdd);
+            const BufPosArrayTfm oTfm(kTgtCols, kTgtRows, vfCol.data(), 0, vfRow.data(), 0, false);
+            Image oWant(eType, kTgtCols, kTgtRows, 1, false);
+            ResampleBuffer oWantView = RealView(oWant.oBuffer);
+            std::vector<unsigned char> vbyWantOutcome;
+            ReferenceResample(RealView(oSrc.oBuffer), oWantView, oTfm, oInfo, vbyWantOutcome);
+            for (const engine::Level eLevel : engine::GetSupportedLevels()) {
+                Image oTgt(eType, kTgtCols, kTgtRows, 1, false);
+                std::vector<unsigned char> vbyOutcome(vbyWantOutcome.size());
+                engine::RunOptions oOptions;
+                oOptions.eLevel = eLevel;
+                oOptions.pabyOutcome = vbyOutcome.data();
+                engine::Resample(oSrc.oBuffer, oTgt.oBuffer, oTfm, oInfo, oOptions);
+                SCOPED_TRACE(testing::Message()
+                             << engine::GetStages(eLevel).pszName << " position " << fOdd
+                             << " at pixel " << nAt << " type " << eType);
+                ASSERT_EQ(vbyWantOutcome, vbyOutcome);
+                ASSERT_EQ(0, std::memcmp(oWant.oSamples.Get(), oTgt.oSamples.Get(),
+                                         oWant.oSamples.Size()));
+            }
+            fPosition = fInner;
         }
     }
 }

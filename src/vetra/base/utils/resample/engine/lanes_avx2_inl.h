@@ -41,6 +41,16 @@ inline F64 Select(B64 m, F64 a, F64 b) {
 
 inline F64 Least(F64 a, F64 b) { return {_mm256_min_pd(a.lo, b.lo), _mm256_min_pd(a.hi, b.hi)}; }
 inline F64 Greatest(F64 a, F64 b) { return {_mm256_max_pd(a.lo, b.lo), _mm256_max_pd(a.hi, b.hi)}; }
+inline double LeastLane(F64 a) {
+    const __m256d v = _mm256_min_pd(a.lo, a.hi);
+    const __m128d w = _mm_min_pd(_mm256_castpd256_pd128(v), _mm256_extractf128_pd(v, 1));
+    return _mm_cvtsd_f64(_mm_min_sd(w, _mm_unpackhi_pd(w, w)));
+}
+inline double GreatestLane(F64 a) {
+    const __m256d v = _mm256_max_pd(a.lo, a.hi);
+    const __m128d w = _mm_max_pd(_mm256_castpd256_pd128(v), _mm256_extractf128_pd(v, 1));
+    return _mm_cvtsd_f64(_mm_max_sd(w, _mm_unpackhi_pd(w, w)));
+}
 
 inline F64 ZeroWhere(B64 m, F64 a) {
     return {_mm256_andnot_pd(m.lo, a.lo), _mm256_andnot_pd(m.hi, a.hi)};

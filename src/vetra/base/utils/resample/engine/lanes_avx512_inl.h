@@ -21,6 +21,8 @@ inline F64 Select(B64 m, F64 a, F64 b) { return {_mm512_mask_blend_pd(m.m, b.v, 
 
 inline F64 Least(F64 a, F64 b) { return {_mm512_min_pd(a.v, b.v)}; }
 inline F64 Greatest(F64 a, F64 b) { return {_mm512_max_pd(a.v, b.v)}; }
+inline double LeastLane(F64 a) { return _mm512_reduce_min_pd(a.v); }
+inline double GreatestLane(F64 a) { return _mm512_reduce_max_pd(a.v); }
 
 inline F64 ZeroWhere(B64 m, F64 a) {
     return {_mm512_maskz_mov_pd(static_cast<__mmask8>(~m.m), a.v)};

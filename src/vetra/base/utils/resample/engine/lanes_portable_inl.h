@@ -48,6 +48,20 @@ inline F64 Select(B64 m, F64 a, F64 b) {
 
 inline F64 Least(F64 a, F64 b) { return Select(a < b, a, b); }
 inline F64 Greatest(F64 a, F64 b) { return Select(a > b, a, b); }
+inline double LeastLane(F64 a) {
+    double df = a.v[0][0];
+    for (int i = 1; i < kLanes; ++i) {
+        df = a.v[i / 2][i % 2] < df ? a.v[i / 2][i % 2] : df;
+    }
+    return df;
+}
+inline double GreatestLane(F64 a) {
+    double df = a.v[0][0];
+    for (int i = 1; i < kLanes; ++i) {
+        df = a.v[i / 2][i % 2] > df ? a.v[i / 2][i % 2] : df;
+    }
+    return df;
+}
 
 inline F64 ZeroWhere(B64 m, F64 a) {
     for (int i = 0; i < kParts; ++i) {

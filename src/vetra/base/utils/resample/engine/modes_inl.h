@@ -107,42 +107,6 @@ VETRA_STAGE void Classes(const ClassLimits& oClassLimits, std::int64_t nPitch,
     }
 }
 
-VETRA_STAGE PositionBounds Bounds(const double* padfCol, const double* padfRow, int nPix) {
-    F64 firstCol = Set1(__builtin_inf());
-    F64 firstRow = firstCol;
-    F64 lastCol = Set1(-__builtin_inf());
-    F64 lastRow = lastCol;
-    int i = 0;
-    for (; i + kLanes <= nPix; i += kLanes) {
-        const F64 col = Load(padfCol + i);
-        const F64 row = Load(padfRow + i);
-        firstCol = Least(col, firstCol);
-        firstRow = Least(row, firstRow);
-        lastCol = Greatest(col, lastCol);
-        lastRow = Greatest(row, lastRow);
-    }
-    double aadf[4][kLanes];
-    Store(aadf[0], firstCol);
-    Store(aadf[1], lastCol);
-    Store(aadf[2], firstRow);
-    Store(aadf[3], lastRow);
-    PositionBounds o{aadf[0][0], aadf[1][0], aadf[2][0], aadf[3][0]};
-    const auto fnAdd = [&](double dfFirstCol, double dfLastCol, double dfFirstRow,
-                           double dfLastRow) {
-        o.dfFirstCol = dfFirstCol < o.dfFirstCol ? dfFirstCol : o.dfFirstCol;
-        o.dfLastCol = dfLastCol > o.dfLastCol ? dfLastCol : o.dfLastCol;
-        o.dfFirstRow = dfFirstRow < o.dfFirstRow ? dfFirstRow : o.dfFirstRow;
-        o.dfLastRow = dfLastRow > o.dfLastRow ? dfLastRow : o.dfLastRow;
-    };
-    for (int k = 1; k < kLanes; ++k) {
-        fnAdd(aadf[0][k], aadf[1][k], aadf[2][k], aadf[3][k]);
-    }
-    for (; i < nPix; ++i) {
-        fnAdd(padfCol[i], padfCol[i], padfRow[i], padfRow[i]);
-    }
-    return o;
-}
-
 // Which of the windows of eight pixels hold no mask byte of 0.
 inline unsigned WholeBits(const MaskBytes& oMask, const std::int64_t* panWindow) {
     unsigned nWhole = 0xff;

@@ -19,6 +19,12 @@ const T* ExactCast(const IBufPosTfm& oTfm) {
     return typeid(oTfm) == typeid(T) ? static_cast<const T*>(&oTfm) : nullptr;
 }
 
+PositionBounds Join(const PositionBounds& a, const PositionBounds& b) {
+    return {std::min(a.dfFirstCol, b.dfFirstCol), std::max(a.dfLastCol, b.dfLastCol),
+            std::min(a.dfFirstRow, b.dfFirstRow), std::max(a.dfLastRow, b.dfLastRow),
+            a.bNumbers && b.bNumbers};
+}
+
 }  // namespace
 
 Positions::Positions(const IBufPosTfm& oTfm)
@@ -57,16 +63,18 @@ bool Positions::IsAxisAligned(int nTgtCols) const {
     return meKind == Kind::eScaleOff && moPart.nCols == nTgtCols;
 }
 
-void Positions::Fill(const LevelStages& oStages, long long nFirst, int nPix, double* padfCol,
-                     double* padfRow) const {
+PositionBounds Positions::Fill(const LevelStages& oStages, long long nFirst, int nPix,
+                               double* padfCol, double* padfRow) const {
+    PositionBounds oBounds{};
     int nDone = 0;
     while (nDone < nPix) {
         const long long nCol = (nFirst + nDone) % moPart.nCols;
         const long long nRow = (nFirst + nDone) / moPart.nCols;
         const int nStretch =
             static_cast<int>(std::min<long long>(nPix - nDone, moPart.nCols - nCol));
-        FillStretch(oStages, moPart.nCol + nCol, moPart.nRow + nRow, nStretch, padfCol + nDone,
-                    padfRow + nDone);
+        const PositionBounds o = FillStretch(oStages, moPart.nCol + nCol, moPart.nRow + nRow,
+                                             nStretch, padfCol + nDone, padfRow + nDone);
+        oBounds = nDone == 0 ? o : Join(oBounds, o);
         nDone += nStretch;
     }
     if (mnSrcCol != 0 || mnSrcRow != 0) {
@@ -74,35 +82,41 @@ void Positions::Fill(const LevelStages& oStages, long long nFirst, int nPix, dou
             padfCol[i] -= mnSrcCol;
             padfRow[i] -= mnSrcRow;
         }
+        oBounds.dfFirstCol -= mnSrcCol;
+        oBounds.dfLastCol -= mnSrcCol;
+        oBounds.dfFirstRow -= mnSrcRow;
+        oBounds.dfLastRow -= mnSrcRow;
     }
     for (int i = nPix; i % kLanes != 0; ++i) {
         padfCol[i] = padfCol[nPix - 1];
         padfRow[i] = padfRow[nPix - 1];
     }
+    return oBounds;
 }
 
-void Positions::FillStretch(const LevelStages& oStages, long long nWholeCol, long long nWholeRow,
-                            int nPix, double* padfCol, double* padfRow) const {
+PositionBounds Positions::FillStretch(const LevelStages& oStages, long long nWholeCol,
+                                      long long nWholeRow, int nPix, double* padfCol,
+                                      double* padfRow) const {
     const long long nFirst = nWholeRow * mnWholeCols + nWholeCol;
     switch (meKind) {
         case Kind::eArray:
-            oStages.pfnArrayPositions(mpafCol + nFirst, mpafRow + nFirst, mnColOff, mnRowOff, nPix,
-                                      padfCol, padfRow);
-            return;
+            return oStages.pfnArrayPositions(mpafCol + nFirst, mpafRow + nFirst, mnColOff, mnRowOff,
+                                             nPix, padfCol, padfRow);
         case Kind::eDoubleArray:
             std::copy_n(mpadfCol + nFirst, nPix, padfCol);
             std::copy_n(mpadfRow + nFirst, nPix, padfRow);
-            return;
+            break;
         case Kind::eBilinear:
             oStages.pfnBilinearPositions(moCorners, nWholeCol, nWholeRow, nPix, padfCol, padfRow);
-            return;
+            break;
         case Kind::eScaleOff:
         case Kind::eOther:
             for (int i = 0; i < nPix; ++i) {
                 mpoWhole->GetSrcPos(nFirst + i, padfCol[i], padfRow[i]);
             }
-            return;
+            break;
     }
+    return oStages.pfnBounds(padfCol, padfRow, nPix);
 }
 
 }  // namespace vetra::utils::engine

@@ -19,14 +19,14 @@ class Positions {
 
     /// Positions of target pixels nFirst to nFirst + nPix - 1, at most kSpanPixels. The arrays have
     /// room for kLanes more, and hold copies of the last position up to a whole group.
-    void Fill(const LevelStages& oStages, long long nFirst, int nPix, double* padfCol,
-              double* padfRow) const;
+    PositionBounds Fill(const LevelStages& oStages, long long nFirst, int nPix, double* padfCol,
+                        double* padfRow) const;
 
  private:
     enum class Kind { eArray, eDoubleArray, eBilinear, eScaleOff, eOther };
 
-    void FillStretch(const LevelStages& oStages, long long nWholeCol, long long nWholeRow, int nPix,
-                     double* padfCol, double* padfRow) const;
+    PositionBounds FillStretch(const LevelStages& oStages, long long nWholeCol, long long nWholeRow,
+                               int nPix, double* padfCol, double* padfRow) const;
 
     /// The transform of the whole target, and the part of it that the run is about.
     const IBufPosTfm* mpoWhole;

@@ -3,6 +3,7 @@
 
 #include <cstddef>
 #include <cstdint>
+#include <limits>
 #include <memory>
 
 #include "vetra/base/utils/resample/engine/aligneddoubles.h"
@@ -61,6 +62,32 @@ struct SpanArrays {
     std::uint64_t anBroken[kSpanWords] = {};
 };
 
+// How far positions move from a target row to the next, as seen at the first pixels of rows.
+class RowStep {
+ public:
+    // Takes notice of the positions of target pixels nFirst to nFirst + nPix - 1.
+    void Look(long long nFirst, int nPix, int nTgtCols, const double* padfCol,
+              const double* padfRow) {
+        const long long nCol = nFirst % nTgtCols;
+        for (long long i = nCol == 0 ? 0 : nTgtCols - nCol; i < nPix; i += nTgtCols) {
+            mdfCols = padfCol[i] - mdfCol;
+            mdfRows = padfRow[i] - mdfRow;
+            mdfCol = padfCol[i];
+            mdfRow = padfRow[i];
+        }
+    }
+    // NaN where it isn't known.
+    double GetCols() const { return mdfCols; }
+    double GetRows() const { return mdfRows; }
+
+ private:
+    static constexpr double kUnknown = std::numeric_limits<double>::quiet_NaN();
+    double mdfCol = kUnknown;
+    double mdfRow = kUnknown;
+    double mdfCols = kUnknown;
+    double mdfRows = kUnknown;
+};
+
 // The windows of some pixels of a span, packed; in whole groups, nothing behind which is looked at.
 struct PackedWindows {
     int nPix;
@@ -104,12 +131,14 @@ class Run {
  private:
     void WalkGeneral(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
                      ValueArrays& oValues) const;
-    void Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArrays) const;
-    void Place(SpanArrays& oArrays) const;
+    void Prepare(long long nFirst, int nPix, MaskMap* poMap, RowStep& oStep,
+                 SpanArrays& oArrays) const;
+    bool AllInside(const PositionBounds& oBounds) const;
+    void Place(const PositionBounds& oBounds, SpanArrays& oArrays) const;
     void PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const;
-    bool Provides(MaskMap& oMap, const SpanArrays& oArrays) const;
+    bool Provides(MaskMap& oMap, const PositionBounds& oBounds) const;
     // Inlined by force: as a function of its own GCC finds it without effect and drops the call.
-    [[gnu::always_inline]] inline void Prefetch(const Span& oSpan) const;
+    [[gnu::always_inline]] inline void Prefetch(const Span& oSpan, const RowStep& oStep) const;
 
     void WalkRows(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
                   ValueArrays& oValues) const;

@@ -2,6 +2,7 @@
 
 #include <algorithm>
 #include <cmath>
+#include <cstring>
 
 #include "vetra/base/utils/resample/engine/run.h"
 
@@ -10,14 +11,16 @@ namespace vetra::utils::engine {
 void Run::WalkGeneral(long long nBegin, long long nEnd, const ThreadMemory& oMemory,
                       ValueArrays& oValues) const {
     SpanArrays oArrays;
+    RowStep oStep;
     for (long long nFirst = nBegin; nFirst < nEnd; nFirst += kSpanPixels) {
         Prepare(nFirst, static_cast<int>(std::min<long long>(kSpanPixels, nEnd - nFirst)),
-                oMemory.poMap.get(), oArrays);
+                oMemory.poMap.get(), oStep, oArrays);
         Finish(oArrays.oSpan, oMemory, oValues);
     }
 }
 
-void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArrays) const {
+void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, RowStep& oStep,
+                  SpanArrays& oArrays) const {
     Span& oSpan = oArrays.oSpan;
     oSpan.nFirst = nFirst;
     oSpan.nPix = nPix;
@@ -32,22 +35,29 @@ void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, SpanArrays& oArray
     oSpan.eValues = moMethod.eValues;
     oSpan.panBroken = nullptr;
 
-    moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
-    if (poMap != nullptr && Provides(*poMap, oArrays)) {
+    const PositionBounds oBounds =
+        moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
+    if (poMap != nullptr && Provides(*poMap, oBounds)) {
         PlaceByMap(*poMap, oArrays);
     } else {
-        Place(oArrays);
+        Place(oBounds, oArrays);
     }
-    Prefetch(oSpan);
+    oStep.Look(nFirst, nPix, moTask.nTgtCols, oArrays.adfCol, oArrays.adfRow);
+    Prefetch(oSpan, oStep);
 }
 
 // Modes first, then the places of each mode.
-void Run::Place(SpanArrays& oArrays) const {
+void Run::Place(const PositionBounds& oBounds, SpanArrays& oArrays) const {
     Span& oSpan = oArrays.oSpan;
     const int nPix = oSpan.nPix;
-    if (mbOpen) {
-        oSpan.nModes = moStages.pfnOpenModes(moLimits, moMethod.eValues != eVR_NONE, mnFallback,
-                                             oArrays.adfCol, oArrays.adfRow, nPix, oArrays.abyMode);
+    const bool bWindow = moMethod.eValues != eVR_NONE;
+    if (mbOpen && AllInside(oBounds)) {
+        const unsigned char nMode = mabyModeOfClass[bWindow ? kClassFits | kClassNear : kClassNear];
+        std::memset(oArrays.abyMode, nMode, sizeof oArrays.abyMode);
+        oSpan.nModes = 1u << nMode;
+    } else if (mbOpen) {
+        oSpan.nModes = moStages.pfnOpenModes(moLimits, bWindow, mnFallback, oArrays.adfCol,
+                                             oArrays.adfRow, nPix, oArrays.abyMode);
     } else {
         moStages.pfnClasses(moLimits, moTask.nSrcCols, oArrays.adfCol, oArrays.adfRow, nPix,
                             oArrays.abyMode, oArrays.anWindow, oArrays.anNearest);
@@ -83,11 +93,25 @@ void Run::PlaceByMap(const MaskMap& oMap, SpanArrays& oArrays) const {
     }
 }
 
+// Whether the windows of a span, or the nearest pixels of a method without, all lie inside the
+// source. What holds for the first and the last position holds for those between.
+bool Run::AllInside(const PositionBounds& o) const {
+    const ClassLimits& l = moLimits;
+    if (moMethod.eValues == eVR_NONE) {
+        return o.bNumbers && o.dfFirstCol + 0.5 >= 0.0 &&
+               o.dfLastCol + 0.5 < l.dfNearColLast + 1.0 && o.dfFirstRow + 0.5 >= 0.0 &&
+               o.dfLastRow + 0.5 < l.dfNearRowLast + 1.0;
+    }
+    const double dfShift = l.bAnchorNearest ? 0.5 : 0.0;
+    return o.bNumbers && o.dfFirstCol + dfShift >= l.dfFitColFirst &&
+           o.dfLastCol + dfShift < l.dfFitColLast + 1.0 &&
+           o.dfFirstRow + dfShift >= l.dfFitRowFirst &&
+           o.dfLastRow + dfShift < l.dfFitRowLast + 1.0;
+}
+
 // Makes the bits of a span's windows and nearest pixels. Neither begins farther from a position
 // than a pixel beyond the window's offset.
-bool Run::Provides(MaskMap& oMap, const SpanArrays& oArrays) const {
-    const PositionBounds oBounds =
-        moStages.pfnBounds(oArrays.adfCol, oArrays.adfRow, oArrays.oSpan.nPix);
+bool Run::Provides(MaskMap& oMap, const PositionBounds& oBounds) const {
     const auto fnReach = [](double dfFirst, double dfLast, double dfOff, int nSize) {
         const double dfEnd = nSize - 1.0;
         Reach oReach;
@@ -104,27 +128,27 @@ bool Run::Provides(MaskMap& oMap, const SpanArrays& oArrays) const {
         fnReach(oBounds.dfFirstRow, oBounds.dfLastRow, moLimits.dfRowOff, moTask.nSrcRows));
 }
 
-// Asks for the source rows that the next target rows will need. A target row crosses many source
-// rows at a slant, a few pixels each, which no prefetcher of the processor foresees; each target
-// row reaches a little further up or down than the one before.
-void Run::Prefetch(const Span& oSpan) const {
+// Asks for the samples that pixels some target rows ahead will need. A target row crosses many
+// source rows at a slant, a few pixels each, which no prefetcher of the processor foresees.
+void Run::Prefetch(const Span& oSpan, const RowStep& oStep) const {
     constexpr int kStep = 8;
-    constexpr int kRowsAhead = 4;
+    constexpr double kTgtRowsAhead = 4.0;
     const bool bWindows = (oSpan.nModes & kSetInterpolated) != 0;
-    if (!bWindows && (oSpan.nModes & kSetNearest) == 0) {
+    const double dfCols = kTgtRowsAhead * oStep.GetCols();
+    const double dfRows = kTgtRowsAhead * oStep.GetRows();
+    const bool bKnown = std::abs(dfCols) < moTask.nSrcCols && std::abs(dfRows) < moTask.nSrcRows;
+    if (!bKnown || (!bWindows && (oSpan.nModes & kSetNearest) == 0)) {
         return;
     }
+    // Of a window the row that is new.
+    const long long nRows = std::llround(dfRows) + (dfRows > 0.0 ? moMethod.oWindow.nRows - 1 : 0);
+    const long long nAhead = nRows * mnPitch + std::llround(dfCols) * moTask.nChan;
     const std::int64_t* panOffset = bWindows ? oSpan.panWindow : oSpan.panNearest;
     // Integers, since the addresses may lie outside the source; a prefetch of those does nothing.
     const auto nSrc = reinterpret_cast<std::uintptr_t>(moTask.pSrc);
-    const auto nRowBytes = static_cast<std::uintptr_t>(mnPitch * mnSrcBytes);
-    const std::uintptr_t nAbove = nSrc - kRowsAhead * nRowBytes;
-    const std::uintptr_t nBelow =
-        nSrc + static_cast<std::uintptr_t>(moMethod.oWindow.nRows - 1 + kRowsAhead) * nRowBytes;
     for (int i = 0; i < oSpan.nPix; i += kStep) {
-        const auto nOffset = static_cast<std::uintptr_t>(panOffset[i] * mnSrcBytes);
-        __builtin_prefetch(reinterpret_cast<const void*>(nAbove + nOffset));
-        __builtin_prefetch(reinterpret_cast<const void*>(nBelow + nOffset));
+        const auto nOffset = static_cast<std::uintptr_t>((panOffset[i] + nAhead) * mnSrcBytes);
+        __builtin_prefetch(reinterpret_cast<const void*>(nSrc + nOffset));
     }
 }
 

@@ -45,12 +45,14 @@ struct ClassLimits {
     double dfRowOff;
 };
 
-/// Least and greatest columns and rows of some positions. Of none, the first is behind the last.
+/// Least and greatest columns and rows of some positions, of those that are numbers. Of none, the
+/// first is behind the last.
 struct PositionBounds {
     double dfFirstCol;
     double dfLastCol;
     double dfFirstRow;
     double dfLastRow;
+    bool bNumbers;  ///< all are numbers, and no huge ones
 };
 
 /// Where the windows, or the nearest pixels, of neighbouring target columns find their bits in a
@@ -323,12 +325,15 @@ struct RowStages {
 struct LevelStages {
     const char* pszName;
 
-    // Positions: kSpanPixels columns and rows from the first nPix source values.
-    void (*pfnArrayPositions)(const float* pafCol, const float* pafRow, double dfColOff,
-                              double dfRowOff, int nPix, double* padfCol, double* padfRow);
+    // Positions: nPix columns and rows from source values. The bounds come with them, or in a step
+    // of their own.
+    PositionBounds (*pfnArrayPositions)(const float* pafCol, const float* pafRow, double dfColOff,
+                                        double dfRowOff, int nPix, double* padfCol,
+                                        double* padfRow);
     /// The first pixel is column nX of row nY; all lie in one row.
     void (*pfnBilinearPositions)(const BilinearCorners& oCorners, std::int64_t nX, std::int64_t nY,
                                  int nPix, double* padfCol, double* padfRow);
+    PositionBounds (*pfnBounds)(const double* padfCol, const double* padfRow, int nPix);
 
     // Modes.
     /// Class bits of each position, and the source pixels at which its window and its nearest pixel
@@ -356,7 +361,6 @@ struct LevelStages {
     /// each word.
     void (*pfnMakeBand)(const std::uint64_t* panBits, std::int64_t nRowWords, int nRows,
                         std::int64_t nWords, unsigned char* pabyBand);
-    PositionBounds (*pfnBounds)(const double* padfCol, const double* padfRow, int nPix);
     /// Classes or modes, where bits of the mask are known, and places: as pfnClasses,
     /// pfnMaskClasses, pfnWindows and pfnNearestPlaces, but places are given for all windows that
     /// fit, and nearest ones only in groups in which the class of one pixel depends on it.

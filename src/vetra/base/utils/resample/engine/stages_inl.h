@@ -16,6 +16,7 @@
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
 //   Set1 Load Store LoadFloats   from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
+//   LeastLane GreatestLane       of the eight; none is a NaN
 //   RunningSums LastLane         sums from the left, up to each lane; the last lane in all
 //   Bits BytesEqual              truth values as bits; which of eight bytes have a value
 //   ByteBits FullPairBits        bits: which bytes at eight offsets have a value; at which offsets
@@ -133,12 +134,12 @@ const LevelStages kStages = {
     VETRA_NAME(VETRA_LEVEL),
     &ArrayPositions,
     &BilinearPositions,
+    &Bounds,
     &Classes,
     &MaskClasses,
     &RowClasses,
     &MaskBits,
     &MakeBand,
-    &Bounds,
     &MappedPlaces,
     &OpenModes,
     &Windows,
