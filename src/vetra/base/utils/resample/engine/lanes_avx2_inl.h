@@ -57,6 +57,9 @@ inline F64 ZeroWhere(B64 m, F64 a) {
 }
 
 inline F64 Set1(double df) { return {_mm256_set1_pd(df), _mm256_set1_pd(df)}; }
+inline F64 Set(double a, double b, double c, double d, double e, double f, double g, double h) {
+    return {_mm256_setr_pd(a, b, c, d), _mm256_setr_pd(e, f, g, h)};
+}
 inline F64 Load(const double* p) { return {_mm256_loadu_pd(p), _mm256_loadu_pd(p + 4)}; }
 inline void Store(double* p, F64 a) {
     _mm256_storeu_pd(p, a.lo);

@@ -29,6 +29,9 @@ inline F64 ZeroWhere(B64 m, F64 a) {
 }
 
 inline F64 Set1(double df) { return {_mm512_set1_pd(df)}; }
+inline F64 Set(double a, double b, double c, double d, double e, double f, double g, double h) {
+    return {_mm512_setr_pd(a, b, c, d, e, f, g, h)};
+}
 inline F64 Load(const double* p) { return {_mm512_loadu_pd(p)}; }
 inline void Store(double* p, F64 a) { _mm512_storeu_pd(p, a.v); }
 

@@ -96,6 +96,9 @@ inline F64 LastLane(F64 a) {
     const Pair v{df, df};
     return {{v, v, v, v}};
 }
+inline F64 Set(double a, double b, double c, double d, double e, double f, double g, double h) {
+    return {{Pair{a, b}, Pair{c, d}, Pair{e, f}, Pair{g, h}}};
+}
 
 inline F64 Set1(double df) {
     const Pair v{df, df};

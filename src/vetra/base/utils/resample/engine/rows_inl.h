@@ -27,6 +27,19 @@ class ChannelReader {
         return Gather(p, manOffset);
     }
 
+    // Their roots.
+    template <typename T>
+    F64 ReadRoots(const T* p) const {
+        if constexpr (kHasRootTable<T>) {
+            if (mnChan == 1) {
+                return PickRoots([&](int i) { return p[i]; });
+            }
+            return PickRoots([&](int i) { return p[manOffset[i]]; });
+        } else {
+            return Root(Read(p));
+        }
+    }
+
  private:
     int mnChan;
     std::int64_t manOffset[kLanes];
@@ -37,19 +50,29 @@ enum class Widened { eSamples, eRoots, eSquaredRoots };
 template <typename T, Widened eWidened>
 VETRA_STAGE void Widen(const void* pSrc, int nChan, std::int64_t nCount, double* padf) {
     const T* p = static_cast<const T*>(pSrc);
-    const ChannelReader oReader(nChan);
-    const auto fnWidened = [](F64 v) {
-        const F64 root = eWidened == Widened::eSamples ? v : Root(v);
-        return eWidened == Widened::eSquaredRoots ? root * root : root;
+    const auto fnWidened = [](const ChannelReader& oReader, const T* q) {
+        if constexpr (eWidened == Widened::eSamples) {
+            return oReader.Read(q);
+        } else {
+            const F64 root = oReader.ReadRoots(q);
+            return eWidened == Widened::eSquaredRoots ? root * root : root;
+        }
     };
+    const ChannelReader oChannel(nChan);
     std::int64_t n = 0;
     for (; n + kLanes <= nCount; n += kLanes, p += static_cast<std::int64_t>(nChan) * kLanes) {
-        Store(padf + n, fnWidened(oReader.Read(p)));
+        Store(padf + n, fnWidened(oChannel, p));
     }
-    for (; n < nCount; ++n, p += nChan) {
+    if (n < nCount) {
+        T aRest[kLanes] = {};
+        for (int i = 0; n + i < nCount; ++i) {
+            aRest[i] = p[static_cast<std::int64_t>(i) * nChan];
+        }
         double adf[kLanes];
-        Store(adf, fnWidened(Set1(static_cast<double>(*p))));
-        padf[n] = adf[0];
+        Store(adf, fnWidened(ChannelReader(1), aRest));
+        for (int i = 0; n + i < nCount; ++i) {
+            padf[n + i] = adf[i];
+        }
     }
 }
 

@@ -30,6 +30,39 @@ constexpr Divisor MakeDivisor(std::int64_t nValue) {
     return {dfValue, dfHigh, dfLow};
 }
 
+// The square roots of 8-bit samples, rounded to nearest, 0 for negative ones: picked up sooner than
+// a processor takes roots.
+template <typename T>
+class ByteRoots {
+ public:
+    constexpr ByteRoots() {
+        for (int n = 1; n < 256 && T(n) > T(0); ++n) {
+            madf[n] = RootOf(n);
+        }
+    }
+    double operator[](T n) const { return madf[static_cast<unsigned char>(n)]; }
+
+ private:
+    // Digit by digit, until the root has all the bits of a double.
+    static constexpr double RootOf(int n) {
+        std::int64_t nRoot = 0;
+        std::int64_t nRest = 0;
+        double dfUnit = 1.0;
+        for (int nShift = 6; nRoot < std::int64_t{1} << 52; nShift -= 2) {
+            nRest = 4 * nRest + (nShift >= 0 ? n >> nShift & 3 : 0);
+            const std::int64_t nNext = 4 * nRoot + 1;
+            nRoot = 2 * nRoot + (nRest >= nNext ? 1 : 0);
+            nRest -= nRest >= nNext ? nNext : 0;
+            dfUnit *= nShift < 0 ? 0.5 : 1.0;
+        }
+        return static_cast<double>(nRest > nRoot ? nRoot + 1 : nRoot) * dfUnit;
+    }
+
+    double madf[256] = {};
+};
+template <typename T>
+constexpr ByteRoots<T> kByteRoots;
+
 // Whether a number in x is below 2^-511 in size, but not 0.
 template <typename Number, int N>
 inline bool AnySmallNumber(const Number (&x)[N]) {

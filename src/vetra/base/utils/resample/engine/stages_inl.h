@@ -14,7 +14,8 @@
 //                                size, except 0
 //   Least Greatest               the first where it is less, or greater, else the second
 //   ZeroWhere                    0.0 in the lanes where a truth value holds
-//   Set1 Load Store LoadFloats   from and to memory, aligned or not
+//   Set Set1                     of eight doubles; of one in all lanes
+//   Load Store LoadFloats        from and to memory, aligned or not
 //   Floor RoundEven Sqrt         RoundEven: to nearest, ties to even
 //   LeastLane GreatestLane       of the eight; none is a NaN
 //   RunningSums LastLane         sums from the left, up to each lane; the last lane in all

@@ -73,6 +73,10 @@ inline void GatherDownTaps(const KernelTables& oTables, F64 fracRow, double* pad
 // Windows of source samples, for one channel.
 template <typename T, bool kSingleChannel>
 struct WindowReader {
+    using SampleType = T;
+    // Whether the pixels of a row are adjacent samples.
+    static constexpr bool kAdjacent = kSingleChannel;
+
     const T* pFirst;
     const std::int64_t* panOffset;
     const WindowSpan& oSpan;
@@ -119,6 +123,8 @@ struct WindowReader {
     }
 
     F64 Sample(int nRow, int nCol) const { return Gather(At(nRow, nCol), panOffset); }
+    // The sample of one lane.
+    T LaneSample(int nRow, int nCol, int i) const { return At(nRow, nCol)[panOffset[i]]; }
 
     // That sample and the one of the next channel.
     void ChannelPair(int nRow, int nCol, F64& first, F64& second) const {
@@ -173,13 +179,21 @@ struct WindowReader {
 // The same where sixteen adjacent samples hold all pairs.
 template <typename T>
 struct GroupReader {
+    using SampleType = T;
+
     const T* pFirst;
     const PairGroup* poGroup;
     std::int64_t nPitch;
 
     void Row(int nRow, F64 (&p)[2]) const {
-        ShufflePairs(pFirst + nRow * nPitch + poGroup->nOffset, poGroup->abyPlace, p[0], p[1]);
+        ShufflePairs(RowOf(nRow), poGroup->abyPlace, p[0], p[1]);
     }
+    T LaneSample(int nRow, int nCol, int i) const {
+        return RowOf(nRow)[poGroup->abyPlace[nCol * kLanes + i]];
+    }
+
+ private:
+    const T* RowOf(int nRow) const { return pFirst + nRow * nPitch + poGroup->nOffset; }
 };
 
 // The square root of a sample that is greater than 0; 0 for every other one, NaN included.
@@ -188,25 +202,82 @@ inline F64 Root(F64 sample) {
     return Select(sample > zero, Sqrt(sample), zero);
 }
 
+template <typename T>
+inline constexpr bool kHasRootTable = sizeof(T) == 1;
+
+// The roots of eight 8-bit samples: fnSample(0) to fnSample(7).
+template <typename Function>
+inline F64 PickRoots(const Function& fnSample) {
+    const auto fnRoot = [&](int i) { return kByteRoots<decltype(fnSample(0))>[fnSample(i)]; };
+    return Set(fnRoot(0), fnRoot(1), fnRoot(2), fnRoot(3), fnRoot(4), fnRoot(5), fnRoot(6),
+               fnRoot(7));
+}
+
+// Four adjacent 8-bit samples at eight offsets, each four read at once.
+template <typename T>
+class ByteQuads {
+ public:
+    ByteQuads(const T* p, const std::int64_t* panOffset) {
+        for (int i = 0; i < kLanes; ++i) {
+            __builtin_memcpy(&manQuad[i], p + panOffset[i], sizeof manQuad[i]);
+        }
+    }
+    // Sample j of lane i.
+    T Get(int i, int j) const {
+        constexpr bool kLittle = __BYTE_ORDER__ == __ORDER_LITTLE_ENDIAN__;
+        return static_cast<T>(manQuad[i] >> 8 * (kLittle ? j : 3 - j));
+    }
+
+ private:
+    std::uint32_t manQuad[kLanes];
+};
+
 // The same windows with the roots of their samples.
 template <typename Window>
 struct RootReader {
+    static constexpr bool kTable = kHasRootTable<typename Window::SampleType>;
+
     const Window& oWindow;
 
     template <int N>
     void Row(int nRow, F64 (&p)[N]) const {
-        oWindow.Row(nRow, p);
-        for (int j = 0; j < N; ++j) {
-            p[j] = Root(p[j]);
+        if constexpr (kTable) {
+            if constexpr (N % 4 == 0) {
+                for (int j = 0; j < N; j += 4) {
+                    Quad(nRow, j, reinterpret_cast<F64(&)[4]>(p[j]));
+                }
+            } else {
+                for (int j = 0; j < N; ++j) {
+                    p[j] = Sample(nRow, j);
+                }
+            }
+        } else {
+            oWindow.Row(nRow, p);
+            TakeRoots(p);
         }
     }
     void Quad(int nRow, int nCol, F64 (&p)[4]) const {
-        oWindow.Quad(nRow, nCol, p);
-        for (int j = 0; j < 4; ++j) {
-            p[j] = Root(p[j]);
+        if constexpr (kTable && Window::kAdjacent) {
+            const ByteQuads oQuads(oWindow.At(nRow, nCol), oWindow.panOffset);
+            for (int j = 0; j < 4; ++j) {
+                p[j] = PickRoots([&](int i) { return oQuads.Get(i, j); });
+            }
+        } else if constexpr (kTable) {
+            for (int j = 0; j < 4; ++j) {
+                p[j] = Sample(nRow, nCol + j);
+            }
+        } else {
+            oWindow.Quad(nRow, nCol, p);
+            TakeRoots(p);
         }
     }
-    F64 Sample(int nRow, int nCol) const { return Root(oWindow.Sample(nRow, nCol)); }
+    F64 Sample(int nRow, int nCol) const {
+        if constexpr (kTable) {
+            return PickRoots([&](int i) { return oWindow.LaneSample(nRow, nCol, i); });
+        } else {
+            return Root(oWindow.Sample(nRow, nCol));
+        }
+    }
     template <typename Parameters>
     const Parameters& Get() const {
         return oWindow.template Get<Parameters>();
@@ -222,6 +293,14 @@ struct RootReader {
     }
     bool HasMask() const { return oWindow.HasMask(); }
     void MaskRow(int nRow, F64 (&p)[4]) const { oWindow.MaskRow(nRow, p); }
+
+ private:
+    template <int N>
+    static void TakeRoots(F64 (&p)[N]) {
+        for (int j = 0; j < N; ++j) {
+            p[j] = Root(p[j]);
+        }
+    }
 };
 
 // Windows of rows that are doubles already (and roots, if need be), which lie as a PickGroup says.
