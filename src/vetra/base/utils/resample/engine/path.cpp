@@ -73,7 +73,9 @@ PathChoice ChoosePath(const Task& oTask, const PathFacts& oFacts) {
     if (oTask.oOptions.ePath == Path::eColumns) {
         oChoice = {Path::eColumns, "asked for"};
     }
-    if (GetKeptBytes(oTask, oFacts, oChoice.ePath) > kMostBytes) {
+    // Narrower strips keep less.
+    if (oFacts.nStripCols <= kSpanPixels &&
+        GetKeptBytes(oTask, oFacts, oChoice.ePath) > kMostBytes) {
         oChoice = {Path::eColumns, "rows would be too large to be kept"};
     }
     return oChoice;

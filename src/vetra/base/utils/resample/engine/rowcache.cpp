@@ -8,8 +8,6 @@ namespace vetra::utils::engine {
 
 namespace {
 
-constexpr int kWidestStrip = 2048;
-static_assert(kWidestStrip % kSpanPixels == 0);
 // What a thread keeps should fit into a part of the second-level cache.
 constexpr double kCacheBytes = 512.0 * 1024;
 // Source columns per target column beyond which rows hold too much that nobody reads.
@@ -40,13 +38,17 @@ RowPlan::RowPlan(const Task& oTask, const LevelStages& oStages, const ColumnTabl
     if (!KeepsRows(moPath.ePath)) {
         return;
     }
-    // As wide as the cache allows.
-    for (int nCols = kWidestStrip; nCols >= kSpanPixels; nCols /= 2) {
-        MakeStrips(oTask, oColumns, nCols);
+    // As few as the cache allows: source rows are read sooner the longer the stretches.
+    const int nSpans = (oTask.nTgtCols + kSpanPixels - 1) / kSpanPixels;
+    for (int nStrips = 1;;) {
+        const int nStripSpans = (nSpans + nStrips - 1) / nStrips;
+        MakeStrips(oTask, oColumns, nStripSpans * kSpanPixels);
         moPath = ChoosePath(oTask, moFacts);
-        if (GetKeptBytes(oTask, moFacts, moPath.ePath) <= kCacheBytes) {
+        const double dfTooMany = GetKeptBytes(oTask, moFacts, moPath.ePath) / kCacheBytes;
+        if (dfTooMany <= 1.0 || nStripSpans == 1) {
             break;
         }
+        nStrips = static_cast<int>(std::clamp(nStrips * dfTooMany, nStrips + 1.0, 1.0 * nSpans));
     }
 }
 
