@@ -16,6 +16,9 @@ int main(int argc, char** argv) {
         for (const auto fnMake : {
                  &VetraCase,
                  &PlainCase,
+#ifdef VETRA_BENCH_BARE
+                 &BareCase,
+#endif
 #ifdef VETRA_BENCH_OPENCV
                  &OpenCvCase,
 #endif

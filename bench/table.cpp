@@ -47,6 +47,7 @@ double TableReporter::TimeOf(const Work& oWork, const std::string& sLibrary) con
 void TableReporter::Finalize() {
     PrintPeers();
     PrintBaselines();
+    PrintBareLoops();
     const MachineRates& oRates = GetMachineRates();
     std::printf("\nFloors: memory moves %.1f bytes per ns, a core does %.1f operations per ns.\n",
                 oRates.dfBytesPerNs, oRates.dfOperationsPerNs);
@@ -85,5 +86,17 @@ void TableReporter::PrintBaselines() {
                     bPlain ? "plain loop of the tests" : oBase.Name().c_str(), Cell(dfBase).c_str(),
                     RatioCell(dfOurs, dfBase).c_str(),
                     oWork.bAvx2 ? RatioCell(dfOurs, TimeOf(oBase, "OpenCV")).c_str() : "");
+    }
+}
+
+void TableReporter::PrintBareLoops() {
+    std::printf("\n| work | vetra | bare loop | ratio |\n|---|---|---|---|\n");
+    for (const Work& oWork : AllWorks()) {
+        const double dfOurs = TimeOf(oWork, "vetra");
+        const double dfBare = TimeOf(oWork, "bare loop");
+        if (dfBare > 0.0) {
+            std::printf("| %s | %s | %s | %s |\n", oWork.Name().c_str(), Cell(dfOurs).c_str(),
+                        Cell(dfBare).c_str(), RatioCell(dfOurs, dfBare).c_str());
+        }
     }
 }

@@ -9,10 +9,10 @@
 
 #include "workload.h"
 
-/// Collects the medians of benchmarks named "work/library" and prints them as two Markdown tables.
+/// Collects the medians of benchmarks named "work/library" and prints them as Markdown tables.
 /// One has nanoseconds per target pixel, the ratio of our time to each peer's, and the floor.
 /// OpenCV's are remap, resize, blur and medianBlur, GDAL's the warper and RasterIO. The other
-/// compares works of ours with each other.
+/// compares works of ours with each other, and a third some with loops that do nothing else.
 class TableReporter : public benchmark::BenchmarkReporter {
  public:
     bool ReportContext(const Context& oContext) override;
@@ -22,6 +22,7 @@ class TableReporter : public benchmark::BenchmarkReporter {
  private:
     void PrintPeers();
     void PrintBaselines();
+    void PrintBareLoops();
     double TimeOf(const Work& oWork, const std::string& sLibrary) const;
 
     /// By work, then by library.

@@ -117,6 +117,10 @@ std::vector<float>& RotatedRows() {
     return vfRows;
 }
 
+std::int64_t RotatedAhead(double dfTgtRows) {
+    return std::llround(dfTgtRows * kdfCos) * kSourceSize - std::llround(dfTgtRows * kdfSin);
+}
+
 std::vector<Work> AllWorks() {
     using Geometry = Work::Geometry;
     const char* const apszWindows[] = {"NEAR",    "BILIN",     "CUBIC",

@@ -1,6 +1,7 @@
 #ifndef VETRA_BENCH_WORKLOAD_H
 #define VETRA_BENCH_WORKLOAD_H
 
+#include <cstdint>
 #include <functional>
 #include <string>
 #include <vector>
@@ -51,6 +52,8 @@ std::vector<unsigned char>& SourceMask();
 std::vector<unsigned char>& TargetSamples();
 std::vector<float>& RotatedCols();
 std::vector<float>& RotatedRows();
+/// Source samples that rotated positions move by within so many target rows.
+std::int64_t RotatedAhead(double dfTgtRows);
 
 /// All works of the table.
 std::vector<Work> AllWorks();
@@ -66,5 +69,7 @@ Case OpenCvCase(const Work& oWork);
 Case GdalCase(const Work& oWork);
 /// The tests' plain evaluation, one pixel after the other.
 Case PlainCase(const Work& oWork);
+/// A loop that does nothing but this work, for the few that have one.
+Case BareCase(const Work& oWork);
 
 #endif  // VETRA_BENCH_WORKLOAD_H
