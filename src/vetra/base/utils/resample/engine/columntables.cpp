@@ -108,6 +108,8 @@ ColumnTables MakeColumnTables(const Task& oTask, const LevelStages& oStages,
         }
         if ((nClass & kClassNear) != 0) {
             oColumns.oReach.Add(oColumns.vnNearestCol[i]);
+        } else {
+            oColumns.bAllNear = false;
         }
     }
     const auto fnOffsets = [&](const std::vector<std::int64_t>& vnCol) {

@@ -32,6 +32,8 @@ struct ColumnTables {
     std::vector<std::int64_t> vnWindow;
     std::vector<std::int64_t> vnNearest;
     std::vector<unsigned char> vbyClass;
+    // Whether all nearest columns are inside.
+    bool bAllNear = true;
     // Of the windows that fit, where they begin, and of the nearest pixels that are inside.
     Reach oReach;
     // Modes by the class of the row, if those are asked for.

@@ -57,6 +57,10 @@ Run::Run(const Task& oTask)
     if (oTask.oOptions.ePath != Path::ePlain) {
         if (bNearest && !moMethod.bNonNegative && oTask.nSrcType == oTask.nTgtType) {
             mpfnCopy = moStages.apfnCopy[oTask.nSrcType];
+            if (oTask.pabySrcMask != nullptr && oTask.pabyTgtMask == nullptr && oTask.nChan == 1 &&
+                oTask.oOptions.pabyOutcome == nullptr && mabyModeOfClass[0] == ePO_BACKGROUND) {
+                mpfnFillInvalid = moStages.apfnFillInvalid[oTask.nSrcType];
+            }
         }
         mbInterleaves = oTask.nChan == 3 || oTask.nChan == 4;
         if (moMethod.eValues == eVR_BILINEAR && mbInterleaves) {

@@ -35,6 +35,8 @@ struct Span {
     const double* padfFracCol = nullptr;
     const double* padfFracRow = nullptr;
     const unsigned char* pabyWindowMask = nullptr;
+    // With this mask nearest samples are copied where it is valid, and there are no modes.
+    const unsigned char* pabyCopyMask = nullptr;
     const PairGroup* poGroups = nullptr;
     // How the values are made; those of windows with replaced samples, which have a bit here, are
     // made once more as the method says.
@@ -190,6 +192,8 @@ class Run {
     int mnTgtBytes;
     // Samples go from source to target as they are; null where they pass through a double.
     CopyFunction mpfnCopy = nullptr;
+    // The source mask alone decides about pixels inside, and invalid ones are background.
+    FillInvalidFunction mpfnFillInvalid = nullptr;
     // The medians of a row cache are values in the target's type.
     bool mbMediansAreSamples = false;
     // Makes the values of mnChannels channels at once; null where that depends on the span.

@@ -40,6 +40,12 @@ void Pack(const Span& oSpan, PackedWindows& oBroken) {
 
 // The last stages: values and store.
 void Run::Finish(const Span& oSpan, const ThreadMemory& oMemory, ValueArrays& oValues) const {
+    if (oSpan.pabyCopyMask != nullptr) {
+        Copy(oSpan, 0, oSpan.nPix);
+        mpfnFillInvalid(oSpan.pabyCopyMask, oSpan.panNearest, oSpan.nPix, moTask.pBackground,
+                        TgtPixel(oSpan.nFirst));
+        return;
+    }
     if (moTask.oOptions.pabyOutcome != nullptr) {
         std::memcpy(moTask.oOptions.pabyOutcome + oSpan.nFirst, oSpan.pabyMode,
                     static_cast<std::size_t>(oSpan.nPix));

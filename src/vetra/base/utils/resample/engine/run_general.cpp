@@ -37,7 +37,13 @@ void Run::Prepare(long long nFirst, int nPix, MaskMap* poMap, RowStep& oStep,
 
     const PositionBounds oBounds =
         moPositions.Fill(moStages, nFirst, nPix, oArrays.adfCol, oArrays.adfRow);
-    if (poMap != nullptr && Provides(*poMap, oBounds)) {
+    oSpan.pabyCopyMask =
+        mpfnFillInvalid != nullptr && AllInside(oBounds) ? moTask.pabySrcMask : nullptr;
+    if (oSpan.pabyCopyMask != nullptr) {
+        oSpan.nModes = kSetNearest;
+        moStages.pfnNearestPlaces(static_cast<double>(mnPitch), 1.0, oArrays.adfCol, oArrays.adfRow,
+                                  nullptr, nPix, oArrays.anNearest);
+    } else if (poMap != nullptr && Provides(*poMap, oBounds)) {
         PlaceByMap(*poMap, oArrays);
     } else {
         Place(oBounds, oArrays);
@@ -146,9 +152,14 @@ void Run::Prefetch(const Span& oSpan, const RowStep& oStep) const {
     const std::int64_t* panOffset = bWindows ? oSpan.panWindow : oSpan.panNearest;
     // Integers, since the addresses may lie outside the source; a prefetch of those does nothing.
     const auto nSrc = reinterpret_cast<std::uintptr_t>(moTask.pSrc);
+    const auto nMask = reinterpret_cast<std::uintptr_t>(oSpan.pabyCopyMask);
     for (int i = 0; i < oSpan.nPix; i += kStep) {
-        const auto nOffset = static_cast<std::uintptr_t>((panOffset[i] + nAhead) * mnSrcBytes);
-        __builtin_prefetch(reinterpret_cast<const void*>(nSrc + nOffset));
+        const auto nOffset = static_cast<std::uintptr_t>(panOffset[i] + nAhead);
+        __builtin_prefetch(reinterpret_cast<const void*>(
+            nSrc + nOffset * static_cast<std::uintptr_t>(mnSrcBytes)));
+        if (oSpan.pabyCopyMask != nullptr) {
+            __builtin_prefetch(reinterpret_cast<const void*>(nMask + nOffset));
+        }
     }
 }
 

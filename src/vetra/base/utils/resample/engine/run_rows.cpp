@@ -69,7 +69,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         Reach oRows;
         oRows.Add(nWindowRow);
         oRows.Add(nNearestRow);
-        if (oMemory.poMap != nullptr && oMemory.poMap->Provide(moColumns.oReach, oRows)) {
+        if (mpfnFillInvalid != nullptr && bNear && moColumns.bAllNear) {
+            oSpan.pabyCopyMask = pabyNearestMask;
+        } else if (oMemory.poMap != nullptr && oMemory.poMap->Provide(moColumns.oReach, oRows)) {
             bMapped = true;
             oMask = {oMemory.poMap->GetWhole(nWindowRow), oMemory.poMap->GetUsable(nNearestRow),
                      moColumns.voWholeGroups.data(),      moColumns.voUsableGroups.data(),
@@ -93,7 +95,9 @@ void Run::FillRow(double dfRow, long long nFirst, int nFirstCol, int nNumCols,
         oSpan.poGroups = moColumns.voGroups.empty() || nCol % kLanes != 0
                              ? nullptr
                              : moColumns.voGroups.data() + nCol / kLanes;
-        if (mbOpen) {
+        if (oSpan.pabyCopyMask != nullptr) {
+            oSpan.nModes = kSetNearest;
+        } else if (mbOpen) {
             oSpan.pabyMode = moColumns.avbyMode[nRowClass].data() + nCol;
             oSpan.nModes = SetOfModes(oSpan.pabyMode, oSpan.nPix);
         } else {

@@ -281,6 +281,10 @@ using StoreFunction = void (*)(const double* padfValue, int nPix, const void* pL
 /// Copies the pixels at panOffset, all channels, to pTgt.
 using CopyFunction = void (*)(const void* pSrc, const std::int64_t* panOffset, int nPix, int nChan,
                               void* pTgt);
+/// Puts the background among nPix samples where the mask byte at an offset is 0. Looks at the
+/// offsets of whole groups.
+using FillInvalidFunction = void (*)(const unsigned char* pabyMask, const std::int64_t* panOffset,
+                                     int nPix, const void* pBackground, void* pTgt);
 /// Writes nPix pixels of three or four channels, whose samples lie in arrays of kSpanArray one
 /// behind the other.
 using InterleaveFunction = void (*)(const void* pSamples, int nPix, void* pTgt);
@@ -417,6 +421,7 @@ struct LevelStages {
     InterleaveFunction apfnInterleave[2][kNumSampleTypes];
     /// Null for the types whose samples may change on their way through a double.
     CopyFunction apfnCopy[kNumSampleTypes];
+    FillInvalidFunction apfnFillInvalid[kNumSampleTypes];
     ClampFunction apfnClamp[kNumSampleTypes];
 };
 

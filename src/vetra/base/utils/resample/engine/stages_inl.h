@@ -125,6 +125,7 @@ namespace {
 #define VETRA_STORE(T) &StoreValues<T>
 #define VETRA_INTERLEAVE(kNumChan, T) &Interleave<kNumChan, T>
 #define VETRA_COPY(T) &CopyPixels<T>
+#define VETRA_FILL_INVALID(T) &FillInvalid<T>
 #define VETRA_CLAMP(T) &ClampSamples<T>
 
 #define VETRA_TEXT(x) #x
@@ -162,6 +163,7 @@ const LevelStages kStages = {
     VETRA_PER_TYPE(VETRA_STORE),
     {VETRA_PER_TYPE(VETRA_INTERLEAVE, 3, ), VETRA_PER_TYPE(VETRA_INTERLEAVE, 4, )},
     VETRA_PER_SHORT_INTEGER(VETRA_COPY),
+    VETRA_PER_SHORT_INTEGER(VETRA_FILL_INVALID),
     VETRA_PER_SHORT_INTEGER(VETRA_CLAMP),
 };
 

@@ -124,6 +124,19 @@ VETRA_STAGE void CopyPixels(const void* pSrc, const std::int64_t* panOffset, int
 }
 
 template <typename T>
+VETRA_STAGE void FillInvalid(const unsigned char* pabyMask, const std::int64_t* panOffset, int nPix,
+                             const void* pBackground, void* pTgt) {
+    const T background = *static_cast<const T*>(pBackground);
+    T* t = static_cast<T*>(pTgt);
+    for (int i = 0; i < nPix; i += kLanes) {
+        const unsigned nInvalid = ByteBits(pabyMask, panOffset + i, 0);
+        for (int k = i; nInvalid != 0 && k < nPix && k < i + kLanes; ++k) {
+            t[k] = (nInvalid >> (k - i) & 1u) != 0 ? background : t[k];
+        }
+    }
+}
+
+template <typename T>
 VETRA_STAGE void ClampSamples(void* pSamples, std::int64_t nSamples, const void* pLimits) {
     const StoreLimits<T> oLimits = *static_cast<const StoreLimits<T>*>(pLimits);
     T* p = static_cast<T*>(pSamples);
